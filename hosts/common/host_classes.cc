@@ -1,0 +1,23 @@
+// The destructors of the classes that a host derives from. They stand here, once, so that every
+// library agrees on the type of an object and a cast from one library's object works in another.
+
+#include "hostapi/coreplane/advanced_option.h"
+#include "hostapi/nodeplane/host.h"
+#include "hostapi/nodeplane/network_interface.h"
+
+namespace Nodeplane {
+
+Network::NetworkInterface::~NetworkInterface() = default;
+Network::CoreNic::~CoreNic() = default;
+
+Hardware::HardwareService::~HardwareService() = default;
+Storage::StorageAdapter::~StorageAdapter() = default;
+Storage::StorageService::~StorageService() = default;
+Driver::HostDriver::~HostDriver() = default;
+Driver::DriverService::~DriverService() = default;
+Host::~Host() = default;
+
+Adv::AdvancedOption::~AdvancedOption() = default;
+Adv::AdvancedIntegerOption::~AdvancedIntegerOption() = default;
+
+}  // namespace Nodeplane

@@ -1,0 +1,192 @@
+#include "hosts/lab/state/default_host.h"
+
+#include <algorithm>
+
+namespace Lab {
+
+namespace {
+
+using Machine::Facts;
+using Machine::Origin;
+
+constexpr char GENERIC_PRODUCT[] = "Generic Machine";
+constexpr char GENERIC_PROCESSOR[] = "Generic Processor";
+// A console with hundreds of devices would spend its start on reading them.
+constexpr size_t MAX_PCI_DEVICES = 64;
+
+// What no machine says of itself.
+Json BuiltInHost() {
+  return Json::parse(R"({
+    "host": {
+      "version": {"product": "Ostrel Laboratory Host", "version": "8.0.2",
+                  "releaseType": "release", "buildText": "24022", "buildNumber": 24022},
+      "auditMode": false, "welcomeMessage": "", "systemAlert": ""
+    },
+    "hardware": {"bmc": "N/A", "storage": [], "drivers": {}, "cardSlots": []},
+    "network": {"kernelNics": {}},
+    "options": {
+      "advanced": {
+        "/UserVars/TarnelTimeOut": {"type": "integer", "value": 600},
+        "/UserVars/OstrelShellTimeOut": {"type": "integer", "value": 0},
+        "/UserVars/OstrelShellInteractiveTimeOut": {"type": "integer", "value": 0}
+      }
+    },
+    "agent": {"lockdown": {"on": false, "possible": true}, "refreshes": 0},
+    "virtualMachines": []
+  })");
+}
+
+std::string OrElse(const std::string& text, const char* fallback) {
+  return text.empty() ? fallback : text;
+}
+
+Json PciDevices(const Facts& facts) {
+  Json devices = Json::array();
+  for (const Machine::PciDevice& device : facts.pciDevices) {
+    if (devices.size() == MAX_PCI_DEVICES) break;
+    devices.push_back({{"address", device.address},
+                       {"class", device.deviceClass},
+                       {"vendor", TextNode(device.vendor)},
+                       {"device", TextNode(device.device)},
+                       {"driver", device.driver}});
+  }
+  return devices;
+}
+
+Json Hardware(const Facts& facts) {
+  const Machine::Firmware& firmware = facts.firmware;
+  return {{"firmware",
+           {{"vendor", TextNode(firmware.vendor)},
+            {"product", TextNode(OrElse(firmware.product, GENERIC_PRODUCT))},
+            {"serialNumber", TextNode(firmware.serialNumber)},
+            {"serviceTag", TextNode(firmware.serialNumber)},
+            {"bios",
+             {{"vendor", TextNode(firmware.biosVendor)},
+              {"versionName", TextNode(OrElse(firmware.biosVersion, "N/A"))},
+              {"versionSuffix", TextNode(firmware.biosDate)},
+              {"assetTag", TextNode(firmware.assetTag)},
+              {"releaseDate", TextNode(firmware.biosDate)},
+              {"machineUuid", TextNode(firmware.uuid)}}}}},
+          {"cpu",
+           {{"model", TextNode(OrElse(facts.processor.model, GENERIC_PROCESSOR))},
+            {"packages", facts.processor.sockets}}},
+          {"memory",
+           {{"pages", facts.memory.totalBytes / std::max<uint64_t>(facts.memory.pageSize, 1)},
+            {"pageSize", facts.memory.pageSize}}},
+          {"pci", PciDevices(facts)}};
+}
+
+Json Pnics(const Facts& facts) {
+  Json pnics = Json::array();
+  for (const Machine::Adapter& adapter : facts.adapters) {
+    pnics.push_back({{"name", adapter.name},
+                     {"mac", adapter.mac},
+                     {"linkUp", adapter.linkUp},
+                     {"pci", adapter.pciAddress}});
+  }
+  return pnics;
+}
+
+int AddressType(Origin origin) {
+  switch (origin) {
+    case Origin::DHCP:
+      return 9;
+    case Origin::AUTOCONF:
+      return 7;
+    case Origin::STATIC:
+      return 0;
+  }
+  return 0;
+}
+
+Json Ipv6Node(const Machine::Ipv6& address) {
+  return {{"address", address.address + "/" + std::to_string(address.prefix)},
+          {"type", AddressType(address.origin)},
+          {"scope", address.linkLocal ? 1 : 3}};
+}
+
+bool HasIpv6From(const Machine::ManagementInterface& nic, Origin origin) {
+  return std::any_of(nic.ipv6.begin(), nic.ipv6.end(), [origin](const Machine::Ipv6& address) {
+    return address.origin == origin && !address.linkLocal;
+  });
+}
+
+// The modes that lead to the addresses which the interface has.
+Json StoredConfig(const Machine::ManagementInterface& nic) {
+  const bool dhcp = !nic.ipv4.address.empty() && nic.ipv4.origin == Origin::DHCP;
+  Json stored = {{"dhcp", dhcp},
+                 {"none", nic.ipv4.address.empty()},
+                 {"ipv6Dhcp", HasIpv6From(nic, Origin::DHCP)},
+                 {"routerAdvertised", HasIpv6From(nic, Origin::AUTOCONF)},
+                 {"dhcpDns", dhcp},
+                 {"ipv6", Json::array()}};
+  if (!dhcp && !nic.ipv4.address.empty()) {
+    stored["address"] = nic.ipv4.address;
+    stored["netmask"] = nic.ipv4.netmask;
+  }
+  for (const Machine::Ipv6& address : nic.ipv6) {
+    if (address.origin == Origin::STATIC) stored["ipv6"].push_back(Ipv6Node(address));
+  }
+  return stored;
+}
+
+Json RunningConfig(const Machine::ManagementInterface& nic) {
+  Json running = {{"ipv6", Json::array()}};
+  const auto set = [&running](const char* name, const std::string& value) {
+    if (!value.empty()) running[name] = value;
+  };
+  set("address", nic.ipv4.address);
+  set("netmask", nic.ipv4.netmask);
+  set("gateway", nic.gateway4);
+  set("gateway6", nic.gateway6);
+  for (const Machine::Ipv6& address : nic.ipv6) running["ipv6"].push_back(Ipv6Node(address));
+  return running;
+}
+
+Json KernelNic(const Machine::ManagementInterface& nic) {
+  Json stored = StoredConfig(nic);
+  const bool bound = stored["dhcp"];
+  return {{"class", "CoreNic"},
+          {"mac", OrElse(nic.mac, "00:00:00:00:00:00")},
+          {"enabled", true},
+          {"configurable", true},
+          {"stored", std::move(stored)},
+          {"running", RunningConfig(nic)},
+          {"lease4", {{"bound", bound}}}};
+}
+
+Json Stack(const Facts& facts) {
+  Json settings = {{"hostname", TextNode(facts.hostName.name)},
+                   {"domain", TextNode(facts.hostName.domain)},
+                   {"suffixes", facts.resolver.searchDomains},
+                   {"gateway4", facts.management.gateway4},
+                   {"gateway6", facts.management.gateway6},
+                   {"dns4", Json::array()},
+                   {"dns6", Json::array()}};
+  for (const std::string& server : facts.resolver.nameServers) {
+    const bool ipv6 = server.find(':') != std::string::npos;
+    settings[ipv6 ? "dns6" : "dns4"].push_back(server);
+  }
+  return {{"running", settings}, {"stored", settings}};
+}
+
+Json Network(const Facts& facts) {
+  Json network = {{"ipv6", {{"running", facts.ipv6Enabled}, {"nextStart", facts.ipv6Enabled}}},
+                  {"pnics", Pnics(facts)},
+                  {"stacks", {{"defaultTcpipStack", Stack(facts)}}}};
+  if (!facts.management.name.empty()) {
+    network["management"] = DEFAULT_NIC;
+    network["kernelNics"][DEFAULT_NIC] = KernelNic(facts.management);
+  }
+  return network;
+}
+
+}  // namespace
+
+Json DefaultHost(const Facts& facts) {
+  Json state = BuiltInHost();
+  state.merge_patch({{"hardware", Hardware(facts)}, {"network", Network(facts)}});
+  return state;
+}
+
+}  // namespace Lab
