@@ -1,0 +1,99 @@
+#pragma once
+
+#include <sys/time.h>
+#include <csignal>
+#include <cstdint>
+#include <string>
+
+#include "hostapi/coreplane/hardware.h"
+#include "shell/window.h"
+#include "widgets/string_factory.h"
+
+namespace Tarnel {
+
+// Thrown when the idle limit is over; unwinds to the welcome screen.
+class TarnelTimeout {};
+
+// Results of Frame::WaitEvent() that are no keys.
+enum Event : int {
+  EVENT_NONE = -1,
+  EVENT_TIME_IS_UP = -2,
+  EVENT_REDRAW = -3,
+  EVENT_RESTART = -4,
+  EVENT_RESIZE = -5,
+  EVENT_END = -6,
+};
+
+// A top-level window with an input loop: the unit of modal interaction. A frame that is started
+// from another dims it for as long as it runs. WaitKey() is the only place where the process waits
+// for the operator.
+class Frame : public Window {
+ public:
+  Frame(Frame* parent, int x, int y, int width, int height, int bg, int fg);
+
+  // Runs this frame in the foreground and gives what its Run() gave.
+  int Exec();
+
+  // Repaints the content; called on the foreground frame when a SIGUSR1 came.
+  virtual void Redraw();
+
+  // The signals of the table in signals.cc become bytes in a pipe from here on, in every thread.
+  // Called once, before any other thread is made. Ends the process with status 1 on failure.
+  static void StartSignalThread();
+  // Reads the idle limit anew.
+  static void LoadIdleTimeout();
+  static void SetLoggedIn(bool loggedIn);
+  static void SetLoginName(const std::string& name);
+  // The last operator that logged in; it stays after the logout.
+  static const std::string& LoginName() { return _loginName; }
+
+  // The first user id on an inserted card, or an empty string.
+  static std::string FindSmartCardLoginId();
+  // Some inserted card carries this user id.
+  static bool IsSmartCardPresent(const std::string& user);
+
+  // A key, or an Event. A null timeout waits for ever.
+  static int WaitEvent(timeval* timeout);
+  // Takes the terminal's new size into curses and logs it.
+  static void HandleResize();
+
+ protected:
+  // The frame's own loop. Its result goes to the caller of Exec().
+  virtual int Run() = 0;
+
+  // The next key. Dims the frame after 60 seconds; with useIdleLimit it throws TarnelTimeout when
+  // the idle limit is over. Signals are dealt with inside.
+  int WaitKey(bool useIdleLimit);
+
+  // Brings the smart card state up to date; ends the process when the card of the operator was
+  // pulled.
+  static void PollSmartCard();
+
+  Frame* _parentFrame;
+  StringFactory* _strings;
+
+  // The frame whose Run() is in progress; null while frames change and after an idle timeout.
+  static Frame* fgFrame;
+  // Seconds; 0 means no limit.
+  static uint32_t _idleTimeout;
+  static bool _loggedIn;
+  static bool _markForRestart;
+  static std::string _loginName;
+  static bool _isLoggedWithSmartCard;
+  static std::string _smartCardLoginId;
+  static Coreplane::Hardware::SmartCardInfoImpl _cardInfo;
+
+ private:
+  void Undim();
+  // True when the event was a key; the others are acted on.
+  bool HandleEvent(int event);
+  static void* SignalHandler(void*);
+
+  static sigset_t _signalSet;
+  static int _signalPipe[2];
+};
+
+// Logs the message with the current errno.
+void LogErrno(const char* message);
+
+}  // namespace Tarnel
