@@ -1,0 +1,58 @@
+#pragma once
+
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <exception>
+#include <functional>
+#include <string>
+
+#include "hostapi/nodeplane/exception.h"
+#include "hosts/lab/state/files.h"
+#include "hosts/lab/state/host_state.h"
+#include "hosts/lab/state/scenario.h"
+
+// Each case starts on the made-up machine.
+class LabTest : public testing::Test {
+ protected:
+  void SetUp() override { Lab::LoadScenario("sample"); }
+
+  static void Patch(const std::string& patch) {
+    Lab::ChangeState([&](Lab::Json& state) { state.merge_patch(Lab::Json::parse(patch)); });
+  }
+  static std::string LabFile(const std::string& name) {
+    return std::string(Lab::LAB_DIRECTORY) + "/" + name;
+  }
+  static std::string TraceText() { return Lab::ReadFile(LabFile("trace")); }
+};
+
+// Starts a process that does the work and ends; an exception gives exit code 1.
+inline pid_t StartProcess(const std::function<void()>& work) {
+  const pid_t pid = fork();
+  if (pid != 0) return pid;
+  try {
+    work();
+  } catch (const std::exception&) {
+    _exit(1);
+  }
+  _exit(0);
+}
+
+// The exit code of a process, -1 when it died otherwise.
+inline int ExitCode(pid_t pid) {
+  int status = 0;
+  if (waitpid(pid, &status, 0) != pid || !WIFEXITED(status)) return -1;
+  return WEXITSTATUS(status);
+}
+
+// The text of the exception of this type that the operation throws, "none" without one.
+template <class Exception = Nodeplane::Lib::NodeplaneException>
+std::string Thrown(const std::function<void()>& operation) {
+  try {
+    operation();
+  } catch (const Exception& error) {
+    return error.what();
+  }
+  return "none";
+}

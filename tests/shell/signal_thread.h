@@ -1,0 +1,19 @@
+#pragma once
+
+#include "shell/frame.h"
+
+namespace Tarnel::Testing {
+
+// The console starts its signal thread once, before any other thread, and so does a test program:
+// this is the first member of a fixture.
+struct SignalThread {
+  SignalThread() {
+    static const bool STARTED = [] {
+      Frame::StartSignalThread();
+      return true;
+    }();
+    (void)STARTED;
+  }
+};
+
+}  // namespace Tarnel::Testing
