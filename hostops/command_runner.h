@@ -23,9 +23,8 @@ extern const std::string TARNEL_TIMEOUT_VAR;
 // argv is null-terminated; entry 0 is the program's short name. outBuf and errBuf, where given,
 // receive at most *outLen and *errLen bytes, without a terminator, and the lengths become what was
 // stored; the rest of the output is dropped. inBuf, where given, is the child's standard input.
-int32_t RunCommand(const char* path, const char** argv, char* outBuf, int32_t* outLen,
-                   char* errBuf, int32_t* errLen, const char* inBuf, uint32_t inLen,
-                   int32_t timeoutSeconds);
+int32_t RunCommand(const char* path, const char** argv, char* outBuf, int32_t* outLen, char* errBuf,
+                   int32_t* errLen, const char* inBuf, uint32_t inLen, int32_t timeoutSeconds);
 
 // Reads until size bytes have come or the end of file; gives the number of bytes read, also when
 // an error ended the reading.
@@ -34,8 +33,8 @@ int32_t ReadFully(int fd, char* buffer, int32_t size);
 // RunCommand without a limit for the management agent's client. argv has the form "stew-cmd",
 // "-U", user, command, null. When the user may not run it (exit code 255), it is run once more as
 // TARNEL_USER, whose name then stands in argv; for that run the capacities are 256.
-int32_t RunStewCmd(const char* path, const char** argv, char* outBuf, int32_t* outLen,
-                   char* errBuf, int32_t* errLen, const char* inBuf, uint32_t inLen);
+int32_t RunStewCmd(const char* path, const char** argv, char* outBuf, int32_t* outLen, char* errBuf,
+                   int32_t* errLen, const char* inBuf, uint32_t inLen);
 
 // Asks the management agent a question; false also when there is no answer within 120 seconds.
 bool QueryStewBool(const std::string& command);
