@@ -29,7 +29,7 @@ std::string TextOf(size_t size) {
 
 void Measure(benchmark::State& state, const std::string& text) {
   const Tarnel::ValueTags facts = {{"hostname", [] { return std::string("rack7"); }}};
-  for (auto _ : state) {
+  for ([[maybe_unused]] auto _ : state) {
     benchmark::DoNotOptimize(Tarnel::LayoutMarkup(text, COLUMNS, facts));
   }
   state.SetBytesProcessed(state.iterations() * static_cast<int64_t>(text.size()));
@@ -71,7 +71,7 @@ void RenderFullScreen(benchmark::State& state) {
   auto* const area = pane.Add<Tarnel::TextArea>(0, 0, COLUMNS, ROWS, Tarnel::PARENT_COLOUR);
   area->Activate(true);
   const std::string text = TextOf(size_t{COLUMNS} * ROWS * 2);
-  for (auto _ : state) {
+  for ([[maybe_unused]] auto _ : state) {
     area->SetText(text);
   }
 }

@@ -3,6 +3,8 @@
 
 #include <unistd.h>
 
+// The names are the sanitizers' own.
+// NOLINTBEGIN(bugprone-reserved-identifier)
 extern "C" {
 
 const char* __asan_default_options();
@@ -20,3 +22,4 @@ const char* __ubsan_default_options() {
 }
 
 }  // extern "C"
+// NOLINTEND(bugprone-reserved-identifier)
