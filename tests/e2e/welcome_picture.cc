@@ -2,12 +2,6 @@
 
 namespace Tarnel::Testing {
 
-const std::vector<std::string> STATIC_NETWORK = {
-    "Download tools to manage this host from:",
-    "http://rack7/",
-    "http://192.0.2.20/ (STATIC)",
-};
-
 std::string WelcomePicture(const Welcome& welcome) {
   const auto width = static_cast<size_t>(welcome.columns);
   const auto height = static_cast<size_t>(welcome.rows);

@@ -5,9 +5,16 @@
 
 namespace Tarnel::Testing {
 
-// What the welcome screen of the made-up machine differs in.
+// The network lines of the made-up machine.
+inline const std::vector<std::string> STATIC_NETWORK = {
+    "Download tools to manage this host from:",
+    "http://rack7/",
+    "http://192.0.2.20/ (STATIC)",
+};
+
+// What the welcome screen of the made-up machine may differ in.
 struct Welcome {
-  std::vector<std::string> network;
+  std::vector<std::string> network = STATIC_NETWORK;
   std::string machine = "Halden Systems Rackline R240";
   std::string processor = "Halden Core 6214 CPU @ 2.40GHz";
   std::string memory = "16 GiB Memory";
@@ -17,9 +24,6 @@ struct Welcome {
 };
 
 // The whole picture, with its box and its two key hints.
-std::string WelcomePicture(const Welcome& welcome);
-
-// The network lines of the made-up machine.
-extern const std::vector<std::string> STATIC_NETWORK;
+std::string WelcomePicture(const Welcome& welcome = {});
 
 }  // namespace Tarnel::Testing

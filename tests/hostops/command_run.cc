@@ -2,6 +2,7 @@
 
 #include <syslog.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <chrono>
 
@@ -11,29 +12,24 @@ namespace Tarnel::Testing {
 
 CommandResult RunPath(const char* path, std::vector<const char*> argv, int32_t capacity,
                       int32_t timeoutSeconds, const std::string& input) {
-  CommandResult result;
+  using Clock = std::chrono::steady_clock;
+  std::string out(static_cast<size_t>(std::max(capacity, 0)), '\0');
+  std::string err = out;
   int32_t outLength = capacity;
   int32_t errLength = capacity;
-  if (capacity >= 0) {
-    result.out.resize(static_cast<size_t>(capacity));
-    result.err.resize(static_cast<size_t>(capacity));
-  }
+  const bool captured = capacity >= 0;
   argv.push_back(nullptr);
-  const auto start = std::chrono::steady_clock::now();
-  result.code = RunCommand(path, argv.data(), capacity < 0 ? nullptr : result.out.data(),
-                           &outLength, capacity < 0 ? nullptr : result.err.data(), &errLength,
-                           input.empty() ? nullptr : input.data(),
-                           static_cast<uint32_t>(input.size()), timeoutSeconds);
-  result.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
-  if (capacity >= 0) {
-    result.out.resize(static_cast<size_t>(outLength));
-    result.err.resize(static_cast<size_t>(errLength));
+  const auto start = Clock::now();
+  const int32_t code = RunCommand(path, argv.data(), captured ? out.data() : nullptr, &outLength,
+                                  captured ? err.data() : nullptr, &errLength,
+                                  input.empty() ? nullptr : input.data(),
+                                  static_cast<uint32_t>(input.size()), timeoutSeconds);
+  const double seconds = std::chrono::duration<double>(Clock::now() - start).count();
+  if (captured) {
+    out.resize(static_cast<size_t>(outLength));
+    err.resize(static_cast<size_t>(errLength));
   }
-  return result;
-}
-
-CommandResult RunTool(std::vector<const char*> argv, int32_t capacity) {
-  return RunPath("/bin/busybox", std::move(argv), capacity);
+  return {code, out, err, seconds};
 }
 
 CommandResult RunShell(const char* script, int32_t capacity, int32_t timeoutSeconds,

@@ -20,9 +20,6 @@ struct CommandResult {
 CommandResult RunPath(const char* path, std::vector<const char*> argv, int32_t capacity = 255,
                       int32_t timeoutSeconds = 0, const std::string& input = "");
 
-// Runs one of busybox's tools without a shell, so that the tool is the very child.
-CommandResult RunTool(std::vector<const char*> argv, int32_t capacity = 4096);
-
 // Runs a shell script.
 CommandResult RunShell(const char* script, int32_t capacity = 255, int32_t timeoutSeconds = 0,
                        const std::string& input = "");

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <functional>
-#include <map>
 
 namespace Tarnel::Testing {
 
@@ -19,10 +18,8 @@ class FakeTime {
 
   // Seconds since the start.
   static double Now();
-  // Has something happen at that time that ends a wait, such as a key.
-  void Plan(double seconds, std::function<void()> action);
-  // The clock is set to another time; what is planned keeps its distance.
-  static void SetBack(double seconds);
+  // Has something happen so many seconds from now that ends a wait, such as a key.
+  static void Plan(double seconds, std::function<void()> action);
   // How often the process began to wait.
   static int Waits();
 };

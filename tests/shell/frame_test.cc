@@ -6,6 +6,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <cmath>
 #include <csignal>
 #include <functional>
 
@@ -20,57 +21,63 @@ namespace Tarnel {
 
 namespace {
 
-using Testing::CursesScreen;
 using Testing::FakeTime;
-using Testing::SleepsForEver;
 
-// A frame whose loop is a function of the test, and which keeps a diary.
+// A frame whose loop is a function of the test, and which keeps a diary with the seconds.
 class TestFrame : public Frame {
  public:
   using Loop = std::function<int(TestFrame&)>;
 
-  TestFrame(TestFrame* parent, int x, int y, int width, int height, Loop loop)
-      : Frame(parent, x, y, width, height, DARK_GREY, WHITE), _loop(std::move(loop)) {
-    PutText(0, 0, parent == nullptr ? "under" : "over");
+  explicit TestFrame(Loop loop)
+      : Frame(nullptr, 0, 0, 12, 3, DARK_GREY, WHITE), _loop(std::move(loop)) {
+    PutText(0, 0, "under");
+  }
+  TestFrame(TestFrame* parent, Loop loop)
+      : Frame(parent, 4, 1, 6, 1, DARK_GREY, WHITE), _loop(std::move(loop)) {
+    PutText(0, 0, "over");
   }
 
   int Run() override { return _loop(*this); }
-  void Redraw() override { diary += "redraw "; }
+  void Redraw() override { Note("redraw"); }
   void Activate(bool active) override {
-    diary += active ? "activate " : "dim ";
-    lastChange = _clock ? FakeTime::Now() : 0;
+    Note(active ? "active" : "dim");
     Frame::Activate(active);
   }
 
-  static void UseFakeTime(bool use) { _clock = use; }
-  static void SetIdleTimeout(uint32_t seconds) { _idleTimeout = seconds; }
-  static bool MarkedForRestart() { return _markForRestart; }
-  static void ClearRestart() { _markForRestart = false; }
-  static Frame* Foreground() { return fgFrame; }
-
+  using Frame::_idleTimeout;
+  using Frame::_markForRestart;
+  using Frame::fgFrame;
   using Frame::WaitKey;
 
   std::string diary;
-  double lastChange = 0;
 
  private:
-  Loop _loop;
-  static bool _clock;
-};
+  void Note(const std::string& what) {
+    diary += std::to_string(std::lround(FakeTime::Now())) + ":" + what + " ";
+  }
 
-bool TestFrame::_clock = false;
+  Loop _loop;
+};
 
 class FrameTest : public testing::Test {
  protected:
+  void PlanKey(double seconds, const std::string& key) {
+    FakeTime::Plan(seconds, [this, key] { _screen.Type(key); });
+  }
+  static void PlanSignal(double seconds, int signal) {
+    FakeTime::Plan(seconds, [signal] { kill(getpid(), signal); });
+  }
+
   Testing::SignalThread _signalThread;
-  CursesScreen _screen{12, 3};
+  Testing::CursesScreen _screen{12, 3};
+  FakeTime _time;
 };
 
 TEST_F(FrameTest, DimsItsParentAndGivesItsResultBack) {
-  TestFrame under(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
-    EXPECT_EQ(TestFrame::Foreground(), &self);
-    TestFrame over(&self, 4, 1, 6, 1, [&](TestFrame& upper) {
-      EXPECT_EQ(TestFrame::Foreground(), &upper);
+  TestFrame under([&](TestFrame& self) {
+    EXPECT_EQ(TestFrame::fgFrame, &self);
+    TestFrame over(&self, [&](TestFrame& upper) {
+      EXPECT_EQ(TestFrame::fgFrame, &upper);
       EXPECT_EQ(_screen.Picture(), "under\n    over\n");
       EXPECT_EQ(_screen.Colours(0), "0/6*12");
       EXPECT_EQ(_screen.Colours(1), "0/6*4 6/7*6 0/6*2");
@@ -78,195 +85,130 @@ TEST_F(FrameTest, DimsItsParentAndGivesItsResultBack) {
     });
     EXPECT_EQ(over.Exec(), 7);
     EXPECT_EQ(over.Exec(), 7);
-    EXPECT_EQ(TestFrame::Foreground(), &self);
+    EXPECT_EQ(TestFrame::fgFrame, &self);
     EXPECT_EQ(_screen.Picture(), "under\n");
     EXPECT_EQ(_screen.Colours(1), "6/7*12");
     return 3;
   });
   EXPECT_EQ(under.Exec(), 3);
-  EXPECT_EQ(TestFrame::Foreground(), nullptr);
-  EXPECT_EQ(under.diary, "activate dim activate dim activate ");
+  EXPECT_EQ(TestFrame::fgFrame, nullptr);
+  EXPECT_EQ(under.diary, "0:active 0:dim 0:active 0:dim 0:active ");
 }
 
-TEST_F(FrameTest, LosesKeysThatWereTypedBeforeItBegan) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
+TEST_F(FrameTest, LosesEarlierKeysAndTakesTheKeypadsEnterForEnter) {
+  TestFrame frame([&](TestFrame& self) {
     _screen.Type("b");
-    return self.WaitKey(false);
-  });
-  _screen.Type("a");
-  EXPECT_EQ(frame.Exec(), 'b');
-}
-
-TEST_F(FrameTest, TakesTheKeypadsEnterForEnter) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
+    EXPECT_EQ(self.WaitKey(false), 'b');
     ungetch(KEY_ENTER);
     return self.WaitKey(false);
   });
+  _screen.Type("a");
   EXPECT_EQ(frame.Exec(), 10);
 }
 
-// What a wait of ten minutes looks like.
+// A wait in which nothing happens.
 struct WaitCase {
   uint32_t limit;
   bool useLimit;
-  double dimmedAt;  // 0: never
+  const char* diary;
   double thrownAt;  // 0: it sleeps for ever
 };
 
-void PrintTo(const WaitCase& row, std::ostream* out) {
-  *out << "limit " << row.limit << (row.useLimit ? "" : " not used");
-}
-
-class FrameInTime : public testing::TestWithParam<WaitCase> {
+class FrameLimit : public FrameTest, public testing::WithParamInterface<WaitCase> {
  protected:
-  FrameInTime() {
-    TestFrame::UseFakeTime(true);
-    TestFrame::SetIdleTimeout(GetParam().limit);
-  }
-  ~FrameInTime() override {
-    TestFrame::UseFakeTime(false);
-    TestFrame::SetIdleTimeout(600);
-  }
-
-  Testing::SignalThread _signalThread;
-  CursesScreen _screen{12, 3};
-  FakeTime _time;
+  FrameLimit() { TestFrame::_idleTimeout = GetParam().limit; }
+  ~FrameLimit() override { TestFrame::_idleTimeout = 600; }
 };
 
-TEST_P(FrameInTime, DimsAndGivesUp) {
-  const WaitCase& row = GetParam();
-  TestFrame frame(nullptr, 0, 0, 12, 3,
-                  [&](TestFrame& self) { return self.WaitKey(row.useLimit); });
-  frame.Activate(true);
-  if (row.thrownAt > 0) {
+TEST_P(FrameLimit, DimsAndGivesUp) {
+  const auto& [limit, useLimit, diary, thrownAt] = GetParam();
+  TestFrame frame([use = useLimit](TestFrame& self) { return self.WaitKey(use); });
+  if (thrownAt > 0) {
     EXPECT_THROW(frame.Exec(), TarnelTimeout);
-    EXPECT_NEAR(FakeTime::Now(), row.thrownAt, 0.001);
-    EXPECT_EQ(TestFrame::Foreground(), nullptr);
+    EXPECT_NEAR(FakeTime::Now(), thrownAt, 0.001);
+    EXPECT_EQ(TestFrame::fgFrame, nullptr);
   } else {
-    EXPECT_THROW(frame.Exec(), SleepsForEver);
+    EXPECT_THROW(frame.Exec(), Testing::SleepsForEver);
   }
-  EXPECT_EQ(frame.diary, row.dimmedAt > 0 ? "activate activate dim " : "activate activate ");
-  EXPECT_NEAR(frame.lastChange, row.dimmedAt, 0.001);
-  EXPECT_EQ(_screen.Colours(0), row.dimmedAt > 0 ? "0/6*12" : "6/7*12");
+  EXPECT_EQ(frame.diary, diary) << limit;
   EXPECT_LE(FakeTime::Waits(), 5);  // no waking up in between
 }
 
-INSTANTIATE_TEST_SUITE_P(Limits, FrameInTime,
-                         testing::Values(WaitCase{600, true, 60, 600}, WaitCase{0, true, 60, 0},
-                                         WaitCase{30, true, 0, 60}, WaitCase{60, true, 0, 60},
-                                         WaitCase{61, true, 60, 61}, WaitCase{600, false, 60, 0},
-                                         WaitCase{30, false, 60, 0}));
+INSTANTIATE_TEST_SUITE_P(Limits, FrameLimit,
+                         testing::Values(WaitCase{600, true, "0:active 60:dim ", 600},
+                                         WaitCase{61, true, "0:active 60:dim ", 61},
+                                         WaitCase{30, true, "0:active ", 60},
+                                         WaitCase{0, true, "0:active 60:dim ", 0},
+                                         WaitCase{30, false, "0:active 60:dim ", 0}));
 
-class FrameInAWait : public FrameTest {
- protected:
-  FrameInAWait() { TestFrame::UseFakeTime(true); }
-  ~FrameInAWait() override { TestFrame::UseFakeTime(false); }
-
-  FakeTime _time;
-};
-
-struct KeyCase {
-  double typedAt;
-  bool dimmed;
-};
-
-TEST_F(FrameInAWait, GetsTheKeyAlsoWhenItIsDimmed) {
-  for (const KeyCase& row :
-       {KeyCase{1, false}, KeyCase{60, false}, KeyCase{60.5, true}, KeyCase{599, true}}) {
-    TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
+TEST_F(FrameTest, GetsTheKeyAlsoWhenItIsDimmed) {
+  for (const bool dimmed : {false, true}) {
+    TestFrame frame([&](TestFrame& self) {
       _screen.TakeOutput();
       return self.WaitKey(true);
     });
-    _time.Plan(FakeTime::Now() + row.typedAt, [this] { _screen.Type("k"); });
+    PlanKey(dimmed ? 60.5 : 60, "k");
     EXPECT_EQ(frame.Exec(), 'k');
-    EXPECT_EQ(frame.diary, row.dimmed ? "activate dim activate " : "activate ") << row.typedAt;
+    EXPECT_EQ(frame.diary.find("dim") != std::string::npos, dimmed);
     UpdateScreen();
+    // The whole screen is sent anew, or nothing.
     const std::string output = _screen.TakeOutput();
-    EXPECT_EQ(output.empty(), !row.dimmed) << row.typedAt;
-    // The whole screen is sent anew.
-    EXPECT_EQ(output.find("\x1b[2J") != std::string::npos, row.dimmed) << row.typedAt;
+    EXPECT_TRUE(dimmed ? output.find("\033[2J") != std::string::npos : output.empty());
     EXPECT_EQ(_screen.Picture(), "under\n");
     EXPECT_EQ(_screen.Colours(0), "6/7*12");
   }
 }
 
-TEST_F(FrameInAWait, IsNotLengthenedByASignalButByAKey) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
+TEST_F(FrameTest, WaitsLongerAfterAKeyButNotAfterASignal) {
+  TestFrame frame([&](TestFrame& self) {
     EXPECT_EQ(self.WaitKey(true), 'k');
     return self.WaitKey(true);
   });
-  _time.Plan(20, [this] { _screen.Type("k"); });
-  _time.Plan(50, [] { kill(getpid(), SIGUSR1); });
+  PlanKey(20, "k");
+  PlanSignal(50.7, SIGUSR1);
   EXPECT_THROW(frame.Exec(), TarnelTimeout);
-  EXPECT_EQ(frame.diary, "activate redraw dim ");
-  EXPECT_NEAR(frame.lastChange, 80, 0.001);
+  EXPECT_EQ(frame.diary, "0:active 51:redraw 80:dim ");
   EXPECT_NEAR(FakeTime::Now(), 620, 0.001);
 }
 
-TEST_F(FrameInAWait, IsRedrawnOnlyInTheForeground) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [](TestFrame& self) { return self.WaitKey(false); });
-  for (const std::string expected : {"", "activate redraw "}) {
-    _time.Plan(FakeTime::Now() + 1, [] { kill(getpid(), SIGUSR1); });
-    _time.Plan(FakeTime::Now() + 2, [this] { _screen.Type("k"); });
-    EXPECT_EQ(expected.empty() ? frame.WaitKey(false) : frame.Exec(), 'k');
-    EXPECT_EQ(frame.diary, expected);
-  }
+TEST_F(FrameTest, IsNotRedrawnInTheBackground) {
+  TestFrame frame([](TestFrame&) { return 0; });
+  PlanSignal(1, SIGUSR1);
+  PlanKey(2, "k");
+  EXPECT_EQ(frame.WaitKey(false), 'k');
+  EXPECT_EQ(frame.diary, "");
 }
 
-TEST_F(FrameInAWait, GetsTheKeyBeforeASignalOfTheSameMoment) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
+TEST_F(FrameTest, GetsTheKeyBeforeASignalOfTheSameMoment) {
+  TestFrame frame([&](TestFrame& self) {
     EXPECT_EQ(self.WaitKey(false), 'k');
-    EXPECT_EQ(self.diary, "activate ");
+    EXPECT_EQ(self.diary, "0:active ");
     return self.WaitKey(false);
   });
-  _time.Plan(1, [this] {
+  FakeTime::Plan(1, [this] {
     kill(getpid(), SIGUSR1);
     _screen.Type("k");
     usleep(20000);  // so that the signal is there, too
   });
-  _time.Plan(2, [this] { _screen.Type("l"); });
+  PlanKey(2, "l");
   EXPECT_EQ(frame.Exec(), 'l');
-  EXPECT_EQ(frame.diary, "activate redraw ");
+  EXPECT_EQ(frame.diary, "0:active 1:redraw ");
 }
 
-TEST_F(FrameInAWait, DimsAMinuteAfterTheClockWasSetBackAtTheLatest) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) { return self.WaitKey(false); });
-  _time.Plan(30, [] {
-    FakeTime::SetBack(3600);
-    kill(getpid(), SIGUSR1);
-  });
-  EXPECT_THROW(frame.Exec(), SleepsForEver);
-  EXPECT_GE(frame.lastChange, 60);
-  EXPECT_LE(frame.lastChange, 90.001);
-}
-
-TEST_F(FrameInAWait, RemembersARestartOnlyWhileAnOperatorIsLoggedIn) {
+TEST_F(FrameTest, RemembersARestartWhileAnOperatorIsLoggedIn) {
   Frame::SetLoggedIn(true);
-  TestFrame frame(nullptr, 0, 0, 12, 3, [&](TestFrame& self) {
-    _screen.TakeOutput();
-    return self.WaitKey(true);
-  });
-  _time.Plan(1, [] { kill(getpid(), SIGUSR2); });
-  _time.Plan(2, [this] { _screen.Type("k"); });
+  TestFrame frame([](TestFrame& self) { return self.WaitKey(true); });
+  PlanSignal(1, SIGUSR2);
+  PlanKey(2, "k");
   EXPECT_EQ(frame.Exec(), 'k');
-  EXPECT_TRUE(TestFrame::MarkedForRestart());
-  EXPECT_EQ(_screen.TakeOutput(), "");
-  TestFrame::ClearRestart();
+  EXPECT_TRUE(TestFrame::_markForRestart);
+  TestFrame::_markForRestart = false;
   Frame::SetLoggedIn(false);
 }
 
-class FrameEnd : public FrameTest {
- protected:
+TEST_F(FrameTest, EndsTheProcessAtTheEndOfTheInput) {
   // The child is started anew, since a forked one would miss the threads.
-  FrameEnd() { GTEST_FLAG_SET(death_test_style, "threadsafe"); }
-};
-
-TEST_F(FrameEnd, ComesWhenTheTerminalIsGone) {
-  _screen.HangUp();
-  EXPECT_EXIT(Frame::WaitEvent(nullptr), testing::ExitedWithCode(0), "");
-}
-
-TEST_F(FrameEnd, ComesAtTheEndOfTheInput) {
+  GTEST_FLAG_SET(death_test_style, "threadsafe");
   EXPECT_EXIT(
       {
         close(STDIN_FILENO);
@@ -276,47 +218,11 @@ TEST_F(FrameEnd, ComesAtTheEndOfTheInput) {
       testing::ExitedWithCode(0), "");
 }
 
-TEST_F(FrameEnd, ComesWithAResizeKey) {
-  TestFrame frame(nullptr, 0, 0, 12, 3, [](TestFrame& self) {
-    ungetch(KEY_RESIZE);
-    return self.WaitKey(false);
-  });
-  EXPECT_EXIT(frame.Exec(), testing::ExitedWithCode(0), "");
-}
-
-struct SizeCase {
-  int columns;
-  int rows;
-  bool taken;
-};
-
-TEST_F(FrameTest, TakesANewSizeUnlessItIsNone) {
-  openlog("TARNEL", 0, LOG_USER);
-  for (const SizeCase& row : {SizeCase{0, 0, false}, SizeCase{80, 0, false}, SizeCase{0, 24, false},
-                              SizeCase{100, 30, true}}) {
-    const Testing::Log log;
-    _screen.Resize(row.columns, row.rows);
-    Frame::HandleResize();
-    if (row.taken) {
-      log.WaitFor({"user.info", "TARNEL: Resized window to 100x30"});
-      EXPECT_EQ(LINES, 30);
-      EXPECT_EQ(COLS, 100);
-    } else {
-      EXPECT_EQ(LINES, 3);
-      EXPECT_EQ(COLS, 12);
-      EXPECT_EQ(log.Lines().size(), 0U);
-    }
-  }
-}
-
 TEST(LoggedErrno, HasNumberAndText) {
   openlog("TARNEL", 0, LOG_USER);
   const Testing::Log log;
-  errno = ENOENT;
-  LogErrno("pipe() failed");
   errno = EINVAL;
   LogErrno("100%s");
-  log.WaitFor({"user.err", "TARNEL: pipe() failed with errno(2): No such file or directory"});
   log.WaitFor({"user.err", "TARNEL: 100%s with errno(22): Invalid argument"});
 }
 

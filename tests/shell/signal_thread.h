@@ -8,11 +8,7 @@ namespace Tarnel::Testing {
 // this is the first member of a fixture.
 struct SignalThread {
   SignalThread() {
-    static const bool STARTED = [] {
-      Frame::StartSignalThread();
-      return true;
-    }();
-    (void)STARTED;
+    [[maybe_unused]] static const bool STARTED = (Frame::StartSignalThread(), true);
   }
 };
 

@@ -9,31 +9,25 @@ namespace Tarnel::Testing {
 
 // A curses screen of a given size on a pseudo-terminal that stands in for descriptors 0 and 1, set
 // up as the console sets it up. One at a time; what the process had as 0 and 1 comes back at the
-// end.
-class CursesScreen {
+// end. It shows what was there after the last update: cells that are staged but not sent are not
+// seen.
+class CursesScreen : public CellScreen {
  public:
   CursesScreen(int columns, int rows, const std::string& term = "xterm-256color");
-  ~CursesScreen();
+  ~CursesScreen() override;
 
   // Types bytes, as an operator would.
   void Type(const std::string& bytes);
-  // The operator's terminal goes away.
-  void HangUp();
-  // Gives the pseudo-terminal another size; curses learns of it only through a signal.
-  void Resize(int columns, int rows);
 
-  // What the terminal shows since the last update: cells that are staged but not sent are not seen.
-  Cell At(int x, int y) const;
-  // A row without the blanks at its end.
-  std::string Row(int y) const;
-  std::string Picture() const;
-  // The colours of a row, as RowColours() writes them.
-  std::string Colours(int y) const;
-  bool CursorVisible() const;
-  int CursorX() const;
-  int CursorY() const;
+  static bool CursorVisible();
+  static int CursorX();
+  static int CursorY();
   // Bytes sent to the terminal since the last call.
   std::string TakeOutput();
+
+ protected:
+  int Rows() const override;
+  CellRow Cells(int y) const override;
 
  private:
   struct Data;

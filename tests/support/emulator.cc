@@ -1,11 +1,20 @@
 #include "tests/support/emulator.h"
 
+#include <algorithm>
+#include <array>
+#include <string_view>
+
 namespace Tarnel::Testing {
 
 namespace {
 
-// Stands in the second cell of a wide character.
-constexpr uint32_t SECOND_HALF = 0xffffffff;
+// The shape of a line drawing character, or a NUL.
+char LineShape(const std::string& character) {
+  constexpr std::string_view LINES = "─│┌┐└┘├┤┴┬┼";
+  constexpr size_t LENGTH = 3;
+  const size_t place = character.size() == LENGTH ? LINES.find(character) : std::string_view::npos;
+  return place == std::string_view::npos ? '\0' : "-|+++++++++"[place / LENGTH];
+}
 
 int ColourNumber(const VTermColor& colour) {
   if (VTERM_COLOR_IS_DEFAULT_FG(&colour) || VTERM_COLOR_IS_DEFAULT_BG(&colour)) {
@@ -46,26 +55,20 @@ std::string Emulator::TakeStandardPart() {
   constexpr size_t SET_LENGTH = 10;
   constexpr size_t RESET_LENGTH = 3;
   std::string standard;
-  for (;;) {
-    const size_t start = _pending.find('\x1b');
-    standard += _pending.substr(0, start);
-    _pending.erase(0, start);
-    if (_pending.size() < 3 && std::string("\x1b]").starts_with(_pending)) {
-      return standard;  // the rest is still to come
-    }
-    const bool set = _pending.starts_with("\x1b]P");
-    const bool reset = _pending.starts_with("\x1b]R");
-    if (set && _pending.size() < SET_LENGTH) {
-      return standard;
-    }
-    if (!set && !reset) {
-      standard += '\x1b';
-      _pending.erase(0, 1);
-      continue;
+  size_t length = 0;
+  size_t at = 0;
+  for (; at < _pending.size(); at += std::max<size_t>(length, 1)) {
+    const std::string start = _pending.substr(at, 3);
+    const bool reset = start == "\x1b]R";
+    length = start == "\x1b]P" ? SET_LENGTH : reset ? RESET_LENGTH : 0;
+    if (at + length > _pending.size() || start == "\x1b" || start == "\x1b]") {
+      break;  // the rest is still to come
     }
     _paletteWasReset = _paletteWasReset || reset;
-    _pending.erase(0, set ? SET_LENGTH : RESET_LENGTH);
+    standard.append(length == 0 ? 1 : 0, start[0]);
   }
+  _pending.erase(0, at);
+  return standard;
 }
 
 void Emulator::Feed(const std::string& bytes) {
@@ -74,7 +77,7 @@ void Emulator::Feed(const std::string& bytes) {
   vterm_input_write(_terminal.get(), standard.data(), standard.size());
 }
 
-void Emulator::Resize(int columns, int rows) { vterm_set_size(_terminal.get(), rows, columns); }
+void Emulator::SetSize(int columns, int rows) { vterm_set_size(_terminal.get(), rows, columns); }
 
 int Emulator::Rows() const {
   int rows = 0;
@@ -83,23 +86,35 @@ int Emulator::Rows() const {
   return rows;
 }
 
-CellRow Emulator::Row(int y) const {
+Cell Emulator::CellAt(VTermPos position) const {
+  VTermScreenCell shown{};
+  vterm_screen_get_cell(_screen, position, &shown);
+  std::array<char, 4 * VTERM_MAX_CHARS_PER_CELL> text{};
+  const size_t length =
+      vterm_screen_get_text(_screen, text.data(), text.size(),
+                            {position.row, position.row + 1, position.col, position.col + 1});
+  Cell cell;
+  cell.text = std::string(text.data(), length);
+  if (const char shape = LineShape(cell.text); shape != '\0') {
+    cell.line = true;
+    cell.text = shape;
+  } else if (shown.chars[0] == 0) {
+    cell.text = ' ';
+  }
+  cell.fg = ColourNumber(shown.fg);
+  cell.bg = ColourNumber(shown.bg);
+  // Terminals of type screen show what others know as italics in standout.
+  cell.standout = shown.attrs.reverse != 0 || shown.attrs.italic != 0;
+  return cell;
+}
+
+CellRow Emulator::Cells(int y) const {
   int rows = 0;
   int columns = 0;
   vterm_get_size(_terminal.get(), &rows, &columns);
   CellRow row;
   for (int x = 0; x < columns; ++x) {
-    VTermScreenCell shown{};
-    vterm_screen_get_cell(_screen, VTermPos{y, x}, &shown);
-    Cell cell = CharacterCell(shown.chars[0] == 0 ? U' ' : shown.chars[0]);
-    if (shown.chars[0] == SECOND_HALF) {
-      cell.text.clear();
-    }
-    cell.fg = ColourNumber(shown.fg);
-    cell.bg = ColourNumber(shown.bg);
-    // Terminals of type screen show what others know as italics in standout.
-    cell.standout = shown.attrs.reverse != 0 || shown.attrs.italic != 0;
-    row.push_back(cell);
+    row.push_back(CellAt({y, x}));
   }
   return row;
 }

@@ -11,7 +11,7 @@
 #include <memory>
 #include <sstream>
 
-#include "tests/support/terminal.h"
+#include "tests/support/wait.h"
 
 namespace Tarnel::Testing {
 

@@ -13,12 +13,9 @@
 #include <csignal>
 #include <cstring>
 #include <fstream>
-#include <optional>
 #include <stdexcept>
 #include <thread>
 
-#include "tests/support/descriptor.h"
-#include "tests/support/emulator.h"
 #include "tests/support/lab.h"
 
 namespace Tarnel::Testing {
@@ -27,6 +24,9 @@ namespace {
 
 using std::chrono::milliseconds;
 using std::chrono::steady_clock;
+
+// What a program ends with when a sanitizer has found something.
+constexpr int SANITIZER_STATUS = 99;
 
 winsize WindowSize(int columns, int rows) {
   return {static_cast<unsigned short>(rows), static_cast<unsigned short>(columns), 0, 0};
@@ -72,140 +72,98 @@ bool Sleeps(pid_t pid) {
 
 }  // namespace
 
-struct Terminal::Data {
-  Data(int columns, int rows) : emulator(columns, rows) {}
-
-  void Start(const Launch& launch);
-  // Takes output in for at most so long, or until some has come; false when none came.
-  bool TakeOutput(milliseconds time);
-  void TakeAllOutput();
-  bool Reap();
-  std::string Picture() const;
-  std::string Describe() const;
-
-  Emulator emulator;
-  Descriptor master;
-  termios modes{};  // as they were before the start
-  pid_t pid = -1;
-  std::optional<int> status;
-  std::string output;
-  std::string keys;
-  milliseconds patience = PATIENCE;
-};
-
-void Terminal::Data::Start(const Launch& launch) {
+Terminal::Terminal(const Launch& launch) : Emulator(launch.columns, launch.rows) {
   const winsize size = WindowSize(launch.columns, launch.rows);
-  int fd = -1;
-  int terminal = -1;
-  if (openpty(&fd, &terminal, nullptr, nullptr, &size) != 0) {
+  int master = -1;
+  int slave = -1;
+  if (openpty(&master, &slave, nullptr, nullptr, &size) != 0) {
     throw std::runtime_error("no pseudo-terminal");
   }
-  const Descriptor slave(terminal);
-  master.Reset(fd);
-  fcntl(fd, F_SETFD, FD_CLOEXEC);
-  tcgetattr(terminal, &modes);
-  pid = fork();
-  if (pid == 0) {
-    login_tty(terminal);
+  _master.Reset(master);
+  fcntl(master, F_SETFD, FD_CLOEXEC);
+  tcgetattr(slave, &_modes);
+  _pid = fork();
+  if (_pid == 0) {
+    login_tty(slave);
     Become(launch);
+  }
+  close(slave);
+}
+
+Terminal::~Terminal() {
+  if (HasEnded()) {
+    return;
+  }
+  Signal(SIGTERM);
+  const int status = WaitForEnd();
+  EXPECT_NE(status, SANITIZER_STATUS) << Describe();
+  if (status < 0) {
+    Signal(SIGKILL);
+    waitpid(_pid, nullptr, 0);
   }
 }
 
-bool Terminal::Data::TakeOutput(milliseconds time) {
-  pollfd readable{master.Get(), POLLIN, 0};
+bool Terminal::TakeOutput(milliseconds time) {
+  pollfd readable{_master.Get(), POLLIN, 0};
   if (poll(&readable, 1, static_cast<int>(time.count())) <= 0) {
     return false;
   }
   std::array<char, 65536> buffer;
-  const ssize_t size = master.Get() < 0 ? 0 : read(master.Get(), buffer.data(), buffer.size());
+  const ssize_t size = read(_master.Get(), buffer.data(), buffer.size());
   if (size <= 0) {  // nobody has the other side open any more
     std::this_thread::sleep_for(std::min(time, milliseconds(2)));
     return false;
   }
   const std::string bytes(buffer.data(), static_cast<size_t>(size));
-  output += bytes;
-  emulator.Feed(bytes);
+  _output += bytes;
+  Feed(bytes);
   return true;
 }
 
-void Terminal::Data::TakeAllOutput() {
+void Terminal::TakeAllOutput() {
   while (TakeOutput(milliseconds(0))) {
   }
 }
 
-bool Terminal::Data::Reap() {
-  int waited = 0;
-  if (!status && waitpid(pid, &waited, WNOHANG) == pid) {
-    status = WIFEXITED(waited) ? WEXITSTATUS(waited) : 256 + WTERMSIG(waited);
-  }
-  return status.has_value();
-}
-
-std::string Terminal::Data::Picture() const {
-  std::vector<CellRow> rows;
-  rows.reserve(static_cast<size_t>(emulator.Rows()));
-  for (int y = 0; y < emulator.Rows(); ++y) {
-    rows.push_back(emulator.Row(y));
-  }
-  return PictureText(rows);
-}
-
-std::string Terminal::Data::Describe() const {
+std::string Terminal::Describe() const {
   return "\nThe screen:\n" + Picture() + "\nThe last keys: " +
-         Readable(keys.substr(keys.size() - std::min<size_t>(keys.size(), 100))) +
-         "\nThe program " + (status ? "has ended with " + std::to_string(*status) : "runs") +
+         Readable(_keys.substr(_keys.size() - std::min<size_t>(_keys.size(), 100))) +
+         "\nThe program " + (_status ? "has ended with " + std::to_string(*_status) : "runs") +
          "\nThe last log lines:\n" + LastLogLines(15);
 }
 
-Terminal::Terminal(const Launch& launch)
-    : _data(std::make_unique<Data>(launch.columns, launch.rows)) {
-  _data->Start(launch);
-}
-
-Terminal::~Terminal() {
-  if (!HasEnded()) {
-    Signal(SIGTERM);
-    if (WaitForEnd() < 0) {
-      Signal(SIGKILL);
-      waitpid(_data->pid, nullptr, 0);
-    }
-  }
-}
-
-void Terminal::SetPatience(milliseconds patience) { _data->patience = patience; }
-
 void Terminal::Type(const std::string& keys) {
-  _data->keys += keys;
-  if (write(_data->master.Get(), keys.data(), keys.size()) != static_cast<ssize_t>(keys.size())) {
-    ADD_FAILURE() << "the terminal takes no keys" << _data->Describe();
+  _keys += keys;
+  if (write(_master.Get(), keys.data(), keys.size()) != static_cast<ssize_t>(keys.size())) {
+    ADD_FAILURE() << "the terminal takes no keys" << Describe();
   }
 }
 
 void Terminal::Resize(int columns, int rows) {
-  _data->TakeAllOutput();
+  TakeAllOutput();
   const winsize size = WindowSize(columns, rows);
   if (columns > 0 && rows > 0) {
-    _data->emulator.Resize(columns, rows);
+    SetSize(columns, rows);
   }
-  ioctl(_data->master.Get(), TIOCSWINSZ, &size);
+  ioctl(_master.Get(), TIOCSWINSZ, &size);
 }
 
-void Terminal::Signal(int signal) const { kill(_data->pid, signal); }
+void Terminal::Signal(int signal) const { kill(_pid, signal); }
 
 void Terminal::HangUp() {
-  _data->TakeAllOutput();
-  _data->master.Reset();
+  TakeAllOutput();
+  _master.Reset();
 }
 
 bool Terminal::WaitUntil(const Condition& condition, const std::string& what) {
-  const auto deadline = steady_clock::now() + _data->patience;
-  _data->TakeAllOutput();
+  const auto deadline = steady_clock::now() + _patience;
+  TakeAllOutput();
   while (!condition()) {
     if (steady_clock::now() > deadline) {
-      ADD_FAILURE() << "In vain waited for " << what << _data->Describe();
+      ADD_FAILURE() << "In vain waited for " << what << Describe();
       return false;
     }
-    _data->TakeOutput(milliseconds(5));
+    TakeOutput(milliseconds(5));
   }
   return true;
 }
@@ -223,7 +181,7 @@ void Terminal::Settle() {
   auto lastOutput = steady_clock::now();
   WaitUntil(
       [&] {
-        if (_data->TakeOutput(milliseconds(5)) || !(HasEnded() || Sleeps(_data->pid))) {
+        if (TakeOutput(milliseconds(5)) || !(HasEnded() || Sleeps(_pid))) {
           lastOutput = steady_clock::now();
         }
         return steady_clock::now() - lastOutput > QUIET;
@@ -233,87 +191,30 @@ void Terminal::Settle() {
 
 int Terminal::WaitForEnd() {
   const bool ended = WaitUntil([this] { return HasEnded(); }, "the program's end");
-  _data->TakeAllOutput();
-  return ended ? *_data->status : -1;
+  TakeAllOutput();
+  return ended ? *_status : -1;
 }
 
-bool Terminal::HasEnded() { return _data->Reap(); }
-
-Cell Terminal::At(int x, int y) {
-  _data->TakeAllOutput();
-  return _data->emulator.Row(y).at(static_cast<size_t>(x));
-}
-
-std::string Terminal::Row(int y) {
-  _data->TakeAllOutput();
-  return RowText(_data->emulator.Row(y));
-}
-
-std::string Terminal::Picture() {
-  _data->TakeAllOutput();
-  return _data->Picture();
-}
-
-std::string Terminal::Colours(int y) {
-  _data->TakeAllOutput();
-  return RowColours(_data->emulator.Row(y));
-}
-
-bool Terminal::CursorVisible() {
-  _data->TakeAllOutput();
-  return _data->emulator.CursorVisible();
-}
-
-int Terminal::CursorX() {
-  _data->TakeAllOutput();
-  return _data->emulator.CursorX();
-}
-
-int Terminal::CursorY() {
-  _data->TakeAllOutput();
-  return _data->emulator.CursorY();
-}
-
-bool Terminal::OnAlternateScreen() {
-  _data->TakeAllOutput();
-  return _data->emulator.OnAlternateScreen();
-}
-
-const std::string& Terminal::Output() {
-  _data->TakeAllOutput();
-  return _data->output;
-}
-
-bool Terminal::PaletteWasReset() {
-  _data->TakeAllOutput();
-  return _data->emulator.PaletteWasReset();
+bool Terminal::HasEnded() {
+  int waited = 0;
+  if (!_status && waitpid(_pid, &waited, WNOHANG) == _pid) {
+    _status = WIFEXITED(waited) ? WEXITSTATUS(waited) : 256 + WTERMSIG(waited);
+  }
+  return _status.has_value();
 }
 
 termios Terminal::Modes() const {
   termios modes{};
-  tcgetattr(_data->master.Get(), &modes);
+  tcgetattr(_master.Get(), &modes);
   return modes;
 }
 
 bool Terminal::ModesAreRestored() const {
   const termios now = Modes();
-  const termios& before = _data->modes;
+  const termios& before = _modes;
   return now.c_iflag == before.c_iflag && now.c_oflag == before.c_oflag &&
          now.c_cflag == before.c_cflag && now.c_lflag == before.c_lflag &&
          std::memcmp(now.c_cc, before.c_cc, sizeof now.c_cc) == 0;
-}
-
-pid_t Terminal::Pid() const { return _data->pid; }
-
-bool WaitUntil(const std::function<bool()>& condition, milliseconds time) {
-  const auto deadline = steady_clock::now() + time;
-  while (!condition()) {
-    if (steady_clock::now() > deadline) {
-      return false;
-    }
-    std::this_thread::sleep_for(milliseconds(2));
-  }
-  return true;
 }
 
 }  // namespace Tarnel::Testing

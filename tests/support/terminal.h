@@ -5,11 +5,13 @@
 
 #include <chrono>
 #include <functional>
-#include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
-#include "tests/support/cell.h"
+#include "tests/support/descriptor.h"
+#include "tests/support/emulator.h"
+#include "tests/support/wait.h"
 
 namespace Tarnel::Testing {
 
@@ -22,9 +24,6 @@ inline constexpr char ESC[] = "\x1b";
 inline constexpr char SPACE[] = " ";
 }  // namespace Keys
 
-// How long a test waits for what must come before it fails.
-inline constexpr std::chrono::milliseconds PATIENCE{10000};
-
 struct Launch {
   std::string program = "/bin/tarnel";
   std::vector<std::string> arguments = {};
@@ -34,19 +33,19 @@ struct Launch {
   std::vector<std::string> environment = {};  // "NAME=value", besides TERM and PATH
 };
 
-// A program on a pseudo-terminal that it controls, and the operator in front of it: an emulated
-// terminal shows what the program writes. Every wait has a deadline; one that fails is a test
-// failure that tells the screen, the last keys and the last log lines.
-class Terminal {
+// A program on a pseudo-terminal that it controls, and the operator in front of it: the terminal
+// shows what the program had written when the last wait ended. Every wait has a deadline; one that
+// fails is a test failure that tells the screen, the last keys and the last log lines.
+class Terminal : public Emulator {
  public:
   using Condition = std::function<bool()>;
 
   explicit Terminal(const Launch& launch = {});
   // Ends a program that still runs, by a signal.
-  ~Terminal();
+  ~Terminal() override;
 
   // Another time for all waits than the usual one.
-  void SetPatience(std::chrono::milliseconds patience);
+  void SetPatience(std::chrono::milliseconds patience) { _patience = patience; }
   void Type(const std::string& keys);
   void Resize(int columns, int rows);
   void Signal(int signal) const;
@@ -65,33 +64,26 @@ class Terminal {
   int WaitForEnd();
   bool HasEnded();
 
-  // What the terminal shows; all output that has come is taken in first.
-  Cell At(int x, int y);
-  std::string Row(int y);
-  std::string Picture();
-  // As RowColours() writes them.
-  std::string Colours(int y);
-  bool CursorVisible();
-  int CursorX();
-  int CursorY();
-  // The screen that programs take over and give back, where the terminal type has one.
-  bool OnAlternateScreen();
-
   // All bytes that the program has written.
-  const std::string& Output();
-  // The palette was reset, which is the last thing that the console does.
-  bool PaletteWasReset();
+  const std::string& Output() const { return _output; }
   termios Modes() const;
   // The modes are those from before the start.
   bool ModesAreRestored() const;
-  pid_t Pid() const;
+  pid_t Pid() const { return _pid; }
 
  private:
-  struct Data;
-  std::unique_ptr<Data> _data;
-};
+  // Takes output in for at most so long, or until some has come; false when none came.
+  bool TakeOutput(std::chrono::milliseconds time);
+  void TakeAllOutput();
+  std::string Describe() const;
 
-// Waits until a condition holds; false when it does not within the time.
-bool WaitUntil(const std::function<bool()>& condition, std::chrono::milliseconds time = PATIENCE);
+  Descriptor _master;
+  termios _modes{};  // as they were before the start
+  pid_t _pid = -1;
+  std::optional<int> _status;
+  std::string _output;
+  std::string _keys;
+  std::chrono::milliseconds _patience = PATIENCE;
+};
 
 }  // namespace Tarnel::Testing

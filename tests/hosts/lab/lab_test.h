@@ -21,10 +21,6 @@ class LabTest : public testing::Test {
   static void Patch(const std::string& patch) {
     Lab::ChangeState([&](Lab::Json& state) { state.merge_patch(Lab::Json::parse(patch)); });
   }
-  static std::string LabFile(const std::string& name) {
-    return std::string(Lab::LAB_DIRECTORY) + "/" + name;
-  }
-  static std::string TraceText() { return Lab::ReadFile(LabFile("trace")); }
 };
 
 // Starts a process that does the work and ends; an exception gives exit code 1.
@@ -46,13 +42,14 @@ inline int ExitCode(pid_t pid) {
   return WEXITSTATUS(status);
 }
 
-// The text of the exception of this type that the operation throws, "none" without one.
-template <class Exception = Nodeplane::Lib::NodeplaneException>
-std::string Thrown(const std::function<void()>& operation) {
+// The text of the exception that the operation throws, "none" without one.
+inline std::string Thrown(const std::function<void()>& operation) {
   try {
     operation();
-  } catch (const Exception& error) {
+  } catch (const Nodeplane::Lib::NodeplaneException& error) {
     return error.what();
+  } catch (const Lab::StateError& error) {
+    return std::string("state: ") + error.what();
   }
   return "none";
 }
