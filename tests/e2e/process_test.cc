@@ -79,9 +79,11 @@ TEST_F(Process, EndsWhenItsTerminalIsGone) {
 TEST_F(Process, IsNotStoppedByTheSuspendKey) {
   Terminal terminal;
   terminal.WaitFor(READY);
-  terminal.Type("\x1a");
   terminal.Settle();
   const size_t before = terminal.Output().size();
+  terminal.Type("\x1a");
+  terminal.Settle();
+  EXPECT_EQ(terminal.Output().size(), before);
   terminal.Type(Keys::SPACE);
   terminal.WaitUntil([&] { return terminal.Output().size() > before; }, "the picture");
 }

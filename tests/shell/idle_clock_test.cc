@@ -28,6 +28,7 @@ TEST(IdleClock, TellsWhatIsDue) {
       {600, 600 * SECOND, true, false},
       {600, 600 * SECOND + 1, true, true},
       // A shorter limit counts as a minute.
+      {30, 60 * SECOND, false, false},
       {30, 60 * SECOND + 1, true, true},
       // A limit that no clock of 32 bits reaches.
       {0xffffffff, 3600 * SECOND, true, false},
