@@ -65,7 +65,9 @@ std::wstring PrintableCells(const std::string& text, int columns) {
 // Gives every cell of a row the attributes and keeps its character. Line characters are such by an
 // attribute of their cell, so the row is rewritten in runs of equal kind.
 void RecolourRow(WINDOW* window, int y, int width, attr_t attributes) {
-  const auto kindAt = [&](int x) { return mvwinch(window, y, x) & A_ALTCHARSET; };
+  std::vector<chtype> cells(static_cast<size_t>(width) + 1);
+  mvwinchnstr(window, y, 0, cells.data(), width);
+  const auto kindAt = [&](int x) { return cells[static_cast<size_t>(x)] & A_ALTCHARSET; };
   const auto pair = static_cast<short>(PAIR_NUMBER(static_cast<int>(attributes)));
   for (int start = 0; start < width;) {
     const chtype kind = kindAt(start);
