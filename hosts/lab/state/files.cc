@@ -31,7 +31,7 @@ std::string ReadFile(const std::string& path) {
 
 std::string ReadFile(const Descriptor& file, const std::string& path) {
   std::string content;
-  char buffer[16384];
+  char buffer[4096];
   for (;;) {
     const ssize_t count = read(file.Get(), buffer, sizeof buffer);
     if (count == 0) return content;
