@@ -60,16 +60,6 @@ TEST_F(StateTest, TheLastOfManyQuickChangesIsSeen) {
   EXPECT_EQ(Lab::ReadState(), Lab::ReadState());
 }
 
-TEST_F(StateTest, AChangeThatThrowsStoresNothingAndFreesTheLock) {
-  const auto change = [](Json& state) {
-    state["half"] = true;
-    throw Lab::StateError("stop");
-  };
-  EXPECT_EQ(Thrown([&] { Lab::ChangeState(change); }), "state: stop");
-  Increment(1);
-  EXPECT_FALSE(Lab::ReadState()->contains("half"));
-}
-
 TEST_F(StateTest, AnUnreadableStateSaysWhichFile) {
   const std::string path = std::string(Lab::LAB_DIRECTORY) + "/state.json";
   Lab::ReplaceFile(path, "{\"host\": ");
