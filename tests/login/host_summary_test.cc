@@ -106,9 +106,10 @@ TEST(AddressText, ShowsAllOfFiveIpv6AddressesAndFourOfMore) {
       "http://[2001:db8::d:7]/ (DHCP)\n"
       "http://[2001:db8::20]/ (STATIC)\n"
       "http://[2001:db8:0:1:2:3:4:5]/ (AUTOCONF)\n";
+  const std::string second = "http://[2001:db8:5::9]/ \n" + rest;
   for (const auto& [count, lines] : {std::pair<size_t, std::string>{0, ""},
                                      {4, shortest + rest},
-                                     {5, shortest + "http://[2001:db8:5::9]/ \n" + rest},
+                                     {5, shortest + second},
                                      {6, shortest + rest + "...\n"}}) {
     ManagementAddresses addresses;
     addresses.ipv4None = true;

@@ -15,23 +15,23 @@ timeval After(int64_t microseconds) {
 }
 
 struct IdleCase {
-  uint32_t limit;
   int64_t elapsed;
+  uint32_t limit;
   bool dim;
   bool over;
 };
 
 TEST(IdleClock, TellsWhatIsDue) {
   const IdleCase rows[] = {
-      {600, 60 * SECOND, false, false},
-      {600, 60 * SECOND + 1, true, false},
-      {600, 600 * SECOND, true, false},
-      {600, 600 * SECOND + 1, true, true},
+      {60 * SECOND, 600, false, false},
+      {60 * SECOND + 1, 600, true, false},
+      {600 * SECOND, 600, true, false},
+      {600 * SECOND + 1, 600, true, true},
       // A shorter limit counts as a minute.
-      {30, 60 * SECOND, false, false},
-      {30, 60 * SECOND + 1, true, true},
+      {60 * SECOND, 30, false, false},
+      {60 * SECOND + 1, 30, true, true},
       // A limit that no clock of 32 bits reaches.
-      {0xffffffff, 3600 * SECOND, true, false},
+      {3600 * SECOND, 0xffffffff, true, false},
   };
   for (const IdleCase& row : rows) {
     IdleClock clock(After(0), row.limit);

@@ -89,7 +89,7 @@ int Emulator::Rows() const {
 Cell Emulator::CellAt(VTermPos position) const {
   VTermScreenCell shown{};
   vterm_screen_get_cell(_screen, position, &shown);
-  std::array<char, 4 * VTERM_MAX_CHARS_PER_CELL> text{};
+  std::array<char, size_t{4} * VTERM_MAX_CHARS_PER_CELL> text{};
   const size_t length =
       vterm_screen_get_text(_screen, text.data(), text.size(),
                             {position.row, position.row + 1, position.col, position.col + 1});

@@ -5,8 +5,6 @@
 #include <string>
 #include <vector>
 
-#include "hostapi/nodeplane/nic_teaming_policy.h"
-
 namespace Nodeplane::Network {
 namespace {
 
@@ -46,15 +44,6 @@ TEST(IpConfig, RemovesNetworksByAddressAndPrefix) {
   config.RemoveIpv6Network(config.GetIpv6Network().front());
   EXPECT_EQ(config.GetIpv6Network(),
             (std::vector{Ipv6Network("2001:db8::2/64"), Ipv6Network("2001:db8::1/48")}));
-}
-
-TEST(NicTeamingPolicy, SettersMarkTheirField) {
-  NicTeamingPolicy policy;
-  policy.SetFieldMask(0x1);
-  policy.SetUplinkOrder({"eth1", "eth0"});
-  EXPECT_EQ(policy.GetFieldMask(), 0x11U);
-  policy.SetMaxActiveUplinks(2);
-  EXPECT_EQ(policy.GetFieldMask(), 0x51U);
 }
 
 }  // namespace

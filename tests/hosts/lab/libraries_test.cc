@@ -1,6 +1,5 @@
 #include <cstring>
 
-#include "hostapi/coreplane/advanced_option.h"
 #include "hostapi/coreplane/hardware.h"
 #include "hostapi/coreplane/ip_services.h"
 #include "hostapi/coreplane/network_info.h"
@@ -11,7 +10,6 @@
 
 namespace {
 
-using Coreplane::Adv::AdvancedOptionImpl;
 using Coreplane::Network::DnsConfigImpl;
 using Coreplane::Network::NetworkInfoImpl;
 using Coreplane::Network::PnicImpl;
@@ -99,16 +97,6 @@ TEST_F(LibrariesTest, AnUpdateDecidesWhichInterfaceIsMeant) {
   info.UpdateManagementInterface();
   EXPECT_EQ(info.GetManagementInterface()->GetName(), "core1");
   EXPECT_EQ(dynamic_cast<CoreNic*>(info.GetManagementInterface().get()), nullptr);
-}
-
-TEST_F(LibrariesTest, AnIntegerOptionKeepsItsValue) {
-  Patch(R"({"options": {"advanced": {"/UserVars/A~B": {"type": "integer", "value": -1}}}})");
-  const auto option = AdvancedOptionImpl::FindOption("/UserVars/A~B");
-  auto& number = dynamic_cast<Nodeplane::Adv::AdvancedIntegerOption&>(*option);
-  EXPECT_EQ(number.GetValue(), -1);
-  number.SetValue(900);
-  EXPECT_EQ(number.GetValue(), 900);
-  EXPECT_EQ(AdvancedOptionImpl::FindOption("/UserVars/None"), nullptr);
 }
 
 TEST_F(LibrariesTest, AHostileStateIsTheHostsException) {

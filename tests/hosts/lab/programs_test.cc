@@ -4,6 +4,8 @@
 
 namespace {
 
+using Nodeplane::Misc::StrPrintf;
+
 class ProgramsTest : public LabTest {};
 
 std::string StateAt(const char* pointer) {
@@ -53,10 +55,10 @@ TEST_F(ProgramsTest, TheAgentAnswersAndActs) {
 
 TEST_F(ProgramsTest, ObeyTheScenarioAndLeaveALine) {
   struct Row {
-    std::string path;
-    std::string arguments;
-    std::string told;  // one entry of the path's list
-    std::string result;
+    const char* path;
+    const char* arguments;
+    const char* told;  // one entry of the path's list
+    const char* result;
   };
   const Row rows[] = {
       {"/bin/stew-cmd", " -U root stewsvc/auth/lockdown_mode_enter",
@@ -70,10 +72,10 @@ TEST_F(ProgramsTest, ObeyTheScenarioAndLeaveALine) {
   };
   for (const auto& [path, arguments, told, result] : rows) {
     Lab::LoadScenario("sample");
-    Patch(R"({"programs":{")" + path + R"(":[)" + told + "]}}");
-    EXPECT_EQ(RunLine(path + arguments), result);
+    Patch(StrPrintf(R"({"programs": {"%s": [%s]}})", path, told));
+    EXPECT_EQ(RunLine(StrPrintf("%s%s", path, arguments)), result);
     EXPECT_EQ(Lab::ReadFile("/etc/halvren/lab/trace"),
-              "program " + path + " " + path + arguments + "\n");
+              StrPrintf("program %s %s%s\n", path, path, arguments));
     EXPECT_EQ(StateAt("/agent/lockdown/on"), "false") << path;
   }
 }

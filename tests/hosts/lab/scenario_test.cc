@@ -67,7 +67,7 @@ TEST(DefaultHostTest, ShowsTheMachine) {
   facts.firmware.vendor = "Ven\xff";
   facts.management.name = "eth0";
   facts.management.ipv4 = {"192.0.2.9", "255.255.255.0", Origin::DHCP};
-  facts.management.ipv6 = {{"2001:db8::1", 64, false, Origin::AUTOCONF},
+  facts.management.ipv6 = {{"2001:db8::1", 128, false, Origin::DHCP},
                            {"2001:db8::2", 64, false, Origin::STATIC},
                            {"fe80::1", 64, true, Origin::AUTOCONF}};
   facts.resolver.nameServers = {"192.0.2.53", "2001:db8::53"};
@@ -75,11 +75,11 @@ TEST(DefaultHostTest, ShowsTheMachine) {
     "/hardware/memory/pages": 2, "/hardware/firmware/vendor": {"bytes": "56656eff"},
     "/hardware/cpu/model": "Generic Processor", "/network/pnics": [],
     "/network/kernelNics/core0/stored": {
-      "dhcp": true, "none": false, "dhcpDns": true, "ipv6Dhcp": false, "routerAdvertised": true,
+      "dhcp": true, "none": false, "dhcpDns": true, "ipv6Dhcp": true, "routerAdvertised": false,
       "ipv6": [{"address": "2001:db8::2/64", "type": 0, "scope": 3}]},
     "/network/kernelNics/core0/running": {
       "address": "192.0.2.9", "netmask": "255.255.255.0",
-      "ipv6": [{"address": "2001:db8::1/64", "type": 7, "scope": 3},
+      "ipv6": [{"address": "2001:db8::1/128", "type": 9, "scope": 3},
                {"address": "2001:db8::2/64", "type": 0, "scope": 3},
                {"address": "fe80::1/64", "type": 7, "scope": 1}]},
     "/network/stacks/defaultTcpipStack/running/dns4": ["192.0.2.53"],
