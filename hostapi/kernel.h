@@ -18,6 +18,9 @@ struct SpawnRequest {
   // Descriptors of the caller that become 0, 1, 2 ... of the child. It inherits no others.
   const int32_t* descriptors;
   int32_t descriptorCount;
+  // Unless -1, a descriptor of the caller that is its controlling terminal: the child leads a
+  // process group of its own, which becomes that terminal's foreground group.
+  int32_t terminal = -1;
 };
 
 struct SpawnResult {

@@ -32,4 +32,11 @@ class AdvancedOptionImpl {
   static std::unique_ptr<Nodeplane::Adv::AdvancedOption> FindOption(const std::string& path);
 };
 
+class UserAdvancedOptionImpl {
+ public:
+  // The host has a user option of this name, whatever its value. Throws NodeplaneException when
+  // the host fails.
+  static bool HasUserOption(const std::string& name);
+};
+
 }  // namespace Coreplane::Adv

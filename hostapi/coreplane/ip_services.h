@@ -24,4 +24,17 @@ class DnsConfigImpl {
   std::unique_ptr<Data> _data;
 };
 
+// The routes of one TCP/IP stack. Every operation throws NodeplaneException when the host fails.
+class RoutingInfoImpl {
+ public:
+  explicit RoutingInfoImpl(const std::string& stack);
+  ~RoutingInfoImpl();
+  RoutingInfoImpl(RoutingInfoImpl&&) noexcept;
+  RoutingInfoImpl& operator=(RoutingInfoImpl&&) noexcept;
+
+ private:
+  struct Data;
+  std::unique_ptr<Data> _data;
+};
+
 }  // namespace Coreplane::Network

@@ -2,6 +2,7 @@
 
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace Coreplane::System {
 
@@ -17,6 +18,15 @@ class SystemInfoImpl {
   std::string GetWelcomeMessage() const;
   // Puts a message into the host's alerts.
   void SetSystemAlert(const std::string& alert) const;
+
+  // Names of all keyboard layouts that the host has, in the host's order.
+  std::vector<std::string> GetKeyboardLayouts() const;
+  // Name of the configured layout.
+  std::string GetKeyboardLayout() const;
+  // Stores the layout for later starts of the host.
+  void SetKeyboardLayout(const std::string& layout) const;
+  // Has the console's keyboard follow the layout from now on.
+  void LoadKeyboardMappings(const std::string& layout) const;
 
  private:
   struct Data;

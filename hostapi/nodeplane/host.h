@@ -71,6 +71,24 @@ class DriverService {
 
 }  // namespace Driver
 
+namespace System {
+
+// What the host offers to the DriverVM, the virtual machine that drives devices for it.
+enum DriverVMState : int {
+  // The host has a DriverVM that takes no devices at present.
+  DRIVER_VM_PRESENT = 1,
+  DRIVER_VM_CONFIGURABLE = 2,
+};
+
+class HostSystem {
+ public:
+  virtual ~HostSystem();
+  // A DriverVMState; any other value means that the host has no DriverVM.
+  virtual int GetDriverVMState() const = 0;
+};
+
+}  // namespace System
+
 // The host itself. The services belong to it and live as long as it does.
 class Host {
  public:
@@ -78,6 +96,7 @@ class Host {
   virtual Hardware::HardwareService& GetHardwareService() = 0;
   virtual Storage::StorageService& GetStorageService() = 0;
   virtual Driver::DriverService& GetDriverService() = 0;
+  virtual System::HostSystem& GetSystem() = 0;
 };
 
 class HostFactory {

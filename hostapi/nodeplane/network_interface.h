@@ -17,6 +17,8 @@ class NetworkInterface {
   virtual IpConfig GetIpConfig() const = 0;
   // The configuration in effect: the addresses that the interface really has.
   virtual IpConfig GetRunningIpConfig() const = 0;
+  // The console may change the interface.
+  virtual bool IsConfigurable() const = 0;
 
  protected:
   NetworkInterface() = default;
@@ -29,6 +31,8 @@ class CoreNic : public NetworkInterface {
 
   // The interface holds a valid DHCP lease for IPv4.
   virtual bool IsDhcpBound() const = 0;
+  // The server that gave the lease for IPv4; 0.0.0.0 when there is none.
+  virtual Ipv4Address GetDhcpServerAddress() const = 0;
 
  protected:
   CoreNic() = default;

@@ -15,6 +15,7 @@ Storage::StorageAdapter::~StorageAdapter() = default;
 Storage::StorageService::~StorageService() = default;
 Driver::HostDriver::~HostDriver() = default;
 Driver::DriverService::~DriverService() = default;
+System::HostSystem::~HostSystem() = default;
 Host::~Host() = default;
 
 Adv::AdvancedOption::~AdvancedOption() = default;

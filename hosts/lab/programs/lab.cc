@@ -51,6 +51,7 @@ constexpr Command COMMANDS[] = {
     {"set", 1, 1, Set},
     {"scenario", 1, 9, [](const Words& words) { Lab::LoadScenarios(words); }},
     {"trace", 0, 1, Trace},
+    {"restart", 0, 0, [](const Words&) { Lab::StartAfresh(); }},
 };
 
 const Command* FindCommand(const Words& words) {
@@ -69,7 +70,8 @@ int main(int argc, char** argv) {
   Words words(argv + 1, argv + argc);
   const Command* command = words.empty() ? nullptr : FindCommand(words);
   if (command == nullptr) {
-    fprintf(stderr, "usage: lab get [POINTER] | set PATCH | scenario NAME ... | trace [clear]\n");
+    fprintf(stderr,
+            "usage: lab get [POINTER] | set PATCH | scenario NAME ... | trace [clear] | restart\n");
     return 2;
   }
   try {

@@ -36,6 +36,11 @@ constexpr milliseconds SHORT_LIFE{1000};
 // How long a process may take to end when it was asked to.
 constexpr milliseconds END_DEADLINE{2000};
 constexpr rlimit USUAL_DESCRIPTORS = {1024, 1024};
+constexpr const char* START_AFRESH[] = {"/bin/lab", "restart", nullptr};
+constexpr char PID_FILE[] = "/var/run/lab-supervisor.pid";
+// What poweroff and reboot of the host send.
+constexpr int POWER_OFF = SIGUSR1;
+constexpr int REBOOT = SIGUSR2;
 constexpr int SIGNAL_STATUS = 128;
 constexpr int CANNOT_RUN = 127;
 
@@ -44,7 +49,8 @@ constexpr int CANNOT_RUN = 127;
 sigset_t AwaitedSignals() {
   sigset_t set;
   sigemptyset(&set);
-  for (const int signal : {SIGINT, SIGTERM, SIGHUP, SIGCHLD}) sigaddset(&set, signal);
+  for (const int signal : {SIGINT, SIGTERM, SIGHUP, SIGCHLD, POWER_OFF, REBOOT})
+    sigaddset(&set, signal);
   return set;
 }
 
@@ -185,6 +191,15 @@ class LogDaemon {
   bool _ready = false;
 };
 
+bool IsPowerSignal(int signal) { return signal == POWER_OFF || signal == REBOOT; }
+
+void WritePidFile() {
+  FILE* const file = fopen(PID_FILE, "w");
+  if (file == nullptr) return;
+  fprintf(file, "%d\n", getpid());
+  fclose(file);
+}
+
 int RunCommand(const char* const* command, const Terminal& terminal) {
   const pid_t child = Start(command, [&terminal] {
     setpgid(0, 0);
@@ -192,6 +207,7 @@ int RunCommand(const char* const* command, const Terminal& terminal) {
   });
   const Ending ending = WaitFor(child);
   if (ending.signal != 0) EndChild(child, ending.signal);
+  if (IsPowerSignal(ending.signal)) puts("lab: the host has gone down");
   return ending.status;
 }
 
@@ -215,8 +231,17 @@ int KeepConsole(const Terminal& terminal) {
     const auto start = Clock::now();
     const pid_t console = Start(CONSOLE, [] {});
     signal = WaitFor(console).signal;
-    if (signal != 0) EndChild(console, signal);
+    if (signal != 0) EndChild(console, IsPowerSignal(signal) ? SIGTERM : signal);
     terminal.Restore();
+    if (signal == POWER_OFF) {
+      puts("lab: the host has been shut down");
+      return 0;
+    }
+    if (signal == REBOOT) {
+      WaitFor(Start(START_AFRESH, [] {}));
+      signal = 0;
+      continue;
+    }
     if (signal == 0 && Terminal::IsThere()) signal = Pause(start);
   }
   return signal == 0 || signal == SIGINT ? 0 : SIGNAL_STATUS + signal;
@@ -238,6 +263,7 @@ int main(int, char** argv) {
     fprintf(stderr, "lab: syslogd does not start\n");
     return 1;
   }
+  WritePidFile();
   const Terminal terminal;
   return argv[1] == nullptr ? KeepConsole(terminal) : RunCommand(argv + 1, terminal);
 }

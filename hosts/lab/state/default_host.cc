@@ -20,11 +20,21 @@ Json BuiltInHost() {
     "host": {
       "version": {"product": "Ostrel Laboratory Host", "version": "8.0.2",
                   "releaseType": "release", "buildText": "24022", "buildNumber": 24022},
-      "auditMode": false, "welcomeMessage": "", "systemAlert": ""
+      "auditMode": false, "welcomeMessage": "", "systemAlert": "", "driverVmState": 0,
+      "keyboard": {"configured": "US Default", "loaded": "US Default",
+                   "layouts": ["Belgian", "Brazilian", "Croatian", "Czechoslovakian", "Danish",
+                               "Estonian", "Finnish", "French", "German", "Greek",
+                               "Icelandic", "Italian", "Japanese", "Latin American", "Norwegian",
+                               "Polish", "Portuguese", "Russian", "Slovenian", "Spanish",
+                               "Swedish", "Swiss French", "Swiss German", "Turkish", "US Default",
+                               "US Dvorak", "Ukrainian", "United Kingdom"]}
     },
+    "files": {"/var/run/halvren/show-tarnel-login": {"content": ""}},
+    "notary": {"init": 0},
     "hardware": {"bmc": "N/A", "storage": [], "drivers": {}, "cardSlots": []},
     "network": {"kernelNics": {}},
     "options": {
+      "user": [],
       "advanced": {
         "/UserVars/TarnelTimeOut": {"type": "integer", "value": 600},
         "/UserVars/OstrelShellTimeOut": {"type": "integer", "value": 0},

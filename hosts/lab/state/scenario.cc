@@ -12,6 +12,8 @@ namespace Lab {
 
 namespace {
 
+constexpr char SUPERVISOR_FILE[] = "/var/run/lab-supervisor.pid";
+
 namespace fs = std::filesystem;
 
 // More levels of "over" than any scenario needs: two that name each other.
@@ -62,6 +64,22 @@ std::string OwnHostsLine(const Json& state, const std::string& name) {
   return address + "\t" + (domain.empty() ? "" : name + "." + domain + " ") + name + "\n";
 }
 
+void TakeStoredConfig(Json& nic) {
+  for (const char* field : {"address", "netmask"}) {
+    if (nic["stored"].contains(field)) nic["running"][field] = nic["stored"][field];
+  }
+}
+
+void TakeStoredSettings(Json& state) {
+  Json& network = state["network"];
+  network["ipv6"]["running"] = Flag(network, "/ipv6/nextStart", false);
+  for (Json& stack : network["stacks"]) stack["running"] = stack["stored"];
+  for (Json& nic : network["kernelNics"]) TakeStoredConfig(nic);
+  for (Json& machine : state["virtualMachines"]) machine["running"] = false;
+  Json& keyboard = state["host"]["keyboard"];
+  keyboard["loaded"] = keyboard["configured"];
+}
+
 }  // namespace
 
 Json MergeScenario(Json base, const std::string& scenario, const std::string& directory) {
@@ -97,6 +115,17 @@ void LoadScenarios(const std::vector<std::string>& scenarios) {
   ApplyFiles(state, "");
   ClearCounts();
   ClearTrace();
+}
+
+void StartAfresh() {
+  ChangeState(TakeStoredSettings);
+  for (const auto& entry : fs::directory_iterator("/var/run")) {
+    if (entry.path() != SUPERVISOR_FILE) fs::remove_all(entry.path());
+  }
+  const auto state = ReadState();
+  for (const auto& [path, entry] : state->value("files", Json::object()).items()) {
+    if (path.starts_with("/var/run/")) ApplyFile(entry, path);
+  }
 }
 
 void LoadScenario(const std::string& scenario) { LoadScenarios({scenario}); }

@@ -30,4 +30,8 @@ void WriteNames(const Json& state, const std::string& root);
 void LoadScenarios(const std::vector<std::string>& scenarios);
 void LoadScenario(const std::string& scenario);
 
+// Inside a lab: what was to take effect at the next start of the host takes effect, its machines
+// have stopped, and what lives only while the host runs is gone.
+void StartAfresh();
+
 }  // namespace Lab

@@ -1,5 +1,6 @@
 #include "hostapi/coreplane/advanced_option.h"
 
+#include <algorithm>
 #include <utility>
 
 #include "hosts/lab/libraries/perform.h"
@@ -62,6 +63,14 @@ std::unique_ptr<AdvancedOption> AdvancedOptionImpl::FindOption(const std::string
         if (type.empty()) return nullptr;
         if (type == "integer") return std::make_unique<LabIntegerOption>(path);
         return std::make_unique<LabOtherOption>();
+      });
+}
+
+bool UserAdvancedOptionImpl::HasUserOption(const std::string& name) {
+  return Lab::PerformRead<bool>(
+      {"UserAdvancedOptionImpl::HasUserOption", name}, [&name](const Json& state) {
+        const Json& options = Lab::List(state, "/options/user");
+        return std::find(options.begin(), options.end(), name) != options.end();
       });
 }
 

@@ -28,4 +28,14 @@ std::string DnsConfigImpl::GetDomain() const {
   return _data->Read("DnsConfigImpl::GetDomain", "/domain");
 }
 
+struct RoutingInfoImpl::Data {
+  std::string stack;
+};
+
+RoutingInfoImpl::RoutingInfoImpl(const std::string& stack)
+    : _data(std::make_unique<Data>(Data{stack})) {}
+RoutingInfoImpl::~RoutingInfoImpl() = default;
+RoutingInfoImpl::RoutingInfoImpl(RoutingInfoImpl&&) noexcept = default;
+RoutingInfoImpl& RoutingInfoImpl::operator=(RoutingInfoImpl&&) noexcept = default;
+
 }  // namespace Coreplane::Network

@@ -74,6 +74,12 @@ class KernelNic : public Base {
         });
   }
 
+  bool IsConfigurable() const override {
+    return Lab::PerformRead<bool>(
+        {"NetworkInterface::IsConfigurable", _name},
+        [this](const Json& state) { return Lab::Flag(NicNode(state, _name), "/configurable"); });
+  }
+
  private:
   std::string _name;
 };
@@ -86,6 +92,13 @@ class LabCoreNic : public KernelNic<CoreNic> {
     return Lab::PerformRead<bool>({"CoreNic::IsDhcpBound", GetName()}, [this](const Json& state) {
       return Lab::Flag(NicNode(state, GetName()), "/lease4/bound");
     });
+  }
+
+  Ipv4Address GetDhcpServerAddress() const override {
+    return Lab::PerformRead<Ipv4Address>(
+        {"CoreNic::GetDhcpServerAddress", GetName()}, [this](const Json& state) {
+          return Ipv4Address(Lab::Text(NicNode(state, GetName()), "/lease4/server", "0.0.0.0"));
+        });
   }
 };
 

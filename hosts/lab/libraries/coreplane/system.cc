@@ -24,4 +24,33 @@ void SystemInfoImpl::SetSystemAlert(const std::string& alert) const {
   });
 }
 
+std::vector<std::string> SystemInfoImpl::GetKeyboardLayouts() const {
+  return Lab::PerformRead<std::vector<std::string>>(
+      {"SystemInfoImpl::GetKeyboardLayouts"}, [](const Lab::Json& state) {
+        std::vector<std::string> layouts;
+        for (const Lab::Json& layout : Lab::List(state, "/host/keyboard/layouts")) {
+          layouts.push_back(Lab::Text(layout, ""));
+        }
+        return layouts;
+      });
+}
+
+std::string SystemInfoImpl::GetKeyboardLayout() const {
+  return Lab::PerformRead<std::string>(
+      {"SystemInfoImpl::GetKeyboardLayout"},
+      [](const Lab::Json& state) { return Lab::Text(state, "/host/keyboard/configured"); });
+}
+
+void SystemInfoImpl::SetKeyboardLayout(const std::string& layout) const {
+  Lab::PerformChange({"SystemInfoImpl::SetKeyboardLayout", "", {layout}}, [&](Lab::Json& state) {
+    state["host"]["keyboard"]["configured"] = Lab::TextNode(layout);
+  });
+}
+
+void SystemInfoImpl::LoadKeyboardMappings(const std::string& layout) const {
+  Lab::PerformChange({"SystemInfoImpl::LoadKeyboardMappings", "", {layout}}, [&](Lab::Json& state) {
+    state["host"]["keyboard"]["loaded"] = Lab::TextNode(layout);
+  });
+}
+
 }  // namespace Coreplane::System

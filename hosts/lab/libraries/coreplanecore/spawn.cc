@@ -33,7 +33,13 @@ class Spawn {
     posix_spawnattr_setsigmask(&_attributes, &set);
     sigfillset(&set);
     posix_spawnattr_setsigdefault(&_attributes, &set);
-    posix_spawnattr_setflags(&_attributes, POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
+    AddFlags(POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
+  }
+
+  // Before the descriptors are passed, which may take the terminal's place.
+  void TakeForeground(int32_t terminal) {
+    AddFlags(POSIX_SPAWN_SETPGROUP);
+    posix_spawn_file_actions_addtcsetpgrp_np(&_actions, terminal);
   }
 
   // A descriptor that another one is to replace is moved out of the way first.
@@ -57,6 +63,12 @@ class Spawn {
   }
 
  private:
+  void AddFlags(int flags) {
+    short present = 0;
+    posix_spawnattr_getflags(&_attributes, &present);
+    posix_spawnattr_setflags(&_attributes, static_cast<short>(present | flags));
+  }
+
   posix_spawnattr_t _attributes;
   posix_spawn_file_actions_t _actions;
   std::vector<Lab::Descriptor> _moved;
@@ -94,6 +106,7 @@ SpawnResult Kernel_Spawn(const SpawnRequest& request) {
   if (!LabAllows(request)) return {-1, -ENOENT, -1};
   Spawn spawn;
   spawn.ResetSignals();
+  if (request.terminal >= 0) spawn.TakeForeground(request.terminal);
   spawn.PassDescriptors(request.descriptors, request.descriptorCount);
   pid_t pid = -1;
   const int error = spawn.Start(request, &pid);

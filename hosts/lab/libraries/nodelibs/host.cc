@@ -106,16 +106,27 @@ class LabDriverService : public Driver::DriverService {
   }
 };
 
+class LabHostSystem : public System::HostSystem {
+ public:
+  int GetDriverVMState() const override {
+    return Lab::PerformRead<int>({"HostSystem::GetDriverVMState"}, [](const Json& state) {
+      return static_cast<int>(Lab::Number(state, "/host/driverVmState", 0));
+    });
+  }
+};
+
 class LabHost : public Host {
  public:
   Hardware::HardwareService& GetHardwareService() override { return _hardware; }
   Storage::StorageService& GetStorageService() override { return _storage; }
   Driver::DriverService& GetDriverService() override { return _driver; }
+  System::HostSystem& GetSystem() override { return _system; }
 
  private:
   LabHardwareService _hardware;
   LabStorageService _storage;
   LabDriverService _driver;
+  LabHostSystem _system;
 };
 
 }  // namespace

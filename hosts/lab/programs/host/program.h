@@ -21,6 +21,10 @@ struct Outcome {
 // Each acts on the host's state as its name says.
 Outcome StewCmd(const Words& words);
 Outcome PowerOffVms(const Words& words);
+Outcome PowerOff(const Words& words);
+Outcome Reboot(const Words& words);
+Outcome FirmwareConfig(const Words& words);
+Outcome Backup(const Words& words);
 
 // Stops the virtual machines for which the choice is true.
 void StopVirtualMachines(bool (*choice)(const Json& machine));
