@@ -221,6 +221,21 @@ pid_t StartChild(const char* path, const char** argv, const Pipe& in, const Pipe
 
 }  // namespace
 
+int RunShell(const char* command) {
+  UpdateScreen();
+  const char* const argv[] = {"sh", "-c", command, nullptr};
+  const int32_t descriptors[] = {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO};
+  const SpawnResult shell =
+      Kernel_Spawn({"/bin/sh", argv, environ, descriptors, std::size(descriptors)});
+  int status = -1;
+  if (shell.status != 0) {
+    return -1;
+  }
+  while (waitpid(shell.pid, &status, 0) < 0 && errno == EINTR) {
+  }
+  return status;
+}
+
 int32_t ReadFully(int fd, char* buffer, int32_t size) {
   int32_t done = 0;
   while (done < size) {

@@ -26,6 +26,10 @@ extern const std::string TARNEL_TIMEOUT_VAR;
 int32_t RunCommand(const char* path, const char** argv, char* outBuf, int32_t* outLen, char* errBuf,
                    int32_t* errLen, const char* inBuf, uint32_t inLen, int32_t timeoutSeconds);
 
+// Runs a command of the shell to its end, on the console's own descriptors and in its environment.
+// Gives the wait status, or -1 when the shell could not be started.
+int RunShell(const char* command);
+
 // Reads until size bytes have come or the end of file; gives the number of bytes read, also when
 // an error ended the reading.
 int32_t ReadFully(int fd, char* buffer, int32_t size);

@@ -248,4 +248,10 @@ void Window::DrawBox() {
   }
 }
 
+void Window::DrawRule(int x, int y, int length) {
+  if (Curses() != nullptr) {
+    mvwhline(Curses(), y, x, 0, length);
+  }
+}
+
 }  // namespace Tarnel

@@ -57,6 +57,15 @@ class Window {
   // Writes at a place in this window, with its current attributes, up to the end of the row. What
   // is no printable character takes one cell all the same.
   void PutText(int x, int y, const std::string& text);
+  // Clears all cells to the background.
+  void Erase();
+  // Draws the default line characters around the window.
+  void DrawBox();
+  // Draws a horizontal line of so many default characters.
+  void DrawRule(int x, int y, int length);
+
+  int Width() const { return _width; }
+  int Height() const { return _height; }
 
   // The one cursor of the screen, at a place relative to this window.
   void MoveCursor(int x, int y);
@@ -64,10 +73,6 @@ class Window {
 
  protected:
   WINDOW* Curses() const { return _window.get(); }
-  // Clears all cells to the background.
-  void Erase();
-  // Draws the default line characters around the window.
-  void DrawBox();
 
   Window* _parent = nullptr;
   int _x;
