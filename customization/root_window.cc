@@ -1,0 +1,55 @@
+#include "customization/root_window.h"
+
+#include <syslog.h>
+
+#include "shell/colours.h"
+
+namespace Tarnel {
+
+namespace {
+
+constexpr int TEXT_PRODUCT = 2;
+constexpr char NETWORK_STACK[] = "defaultTcpipStack";
+
+}  // namespace
+
+// The panes share the cells of the frame area, so the box and the rule that are drawn after them
+// stay on top of both.
+RootWindow::RootWindow(Frame* parent)
+    : Frame(parent, 0, 0, COLS, LINES, BLACK, WHITE),
+      _dnsConfig(NETWORK_STACK),
+      _routingInfo(NETWORK_STACK) {
+  const int half = COLS / 2;
+  const int height = LINES - 1;
+  _frameArea = CreateChild(0, 0, COLS, height, LIGHT_GREY, WHITE);
+  _statusLine = CreateChild(0, height, COLS, 1, BLACK, LIGHT_GREY);
+  _leftPane = _frameArea->CreateChild(0, 0, half, height, YELLOW, WHITE);
+  _rightPane = _frameArea->CreateChild(half, 0, half, height, DARK_GREY, WHITE);
+  _frameArea->DrawBox();
+  _frameArea->DrawRule(1, 2, COLS - 2);
+  syslog(LOG_INFO, "COLS=%d, LINES=%d", COLS, LINES);
+  _list = _leftPane->Add<ItemList>(2, 4, half - 2, LINES - 6);
+  _rightText = _rightPane->Add<TextArea>(2, 4, half - 4, LINES - 6, LIGHT_GREY);
+  _leftTitle = _leftPane->Add<TextArea>(3, 1, half - 6, 1, BLACK);
+  _rightTitle = _rightPane->Add<TextArea>(2, 1, half - 6, 1, WHITE);
+  _leftHint = _leftPane->Add<TextArea>(2, LINES - 3, half - 3, 1, BLACK);
+  _rightHint = _rightPane->Add<TextArea>(1, LINES - 3, half - 3, 1, WHITE);
+}
+
+void RootWindow::ShowScreen() {
+  Activate(true);
+  const std::string product = _strings->GetString(TEXT_PRODUCT);
+  _statusLine->PutText(_statusLine->Width() / 2 - static_cast<int>(product.size()) / 2, 0, product);
+  RefreshPanes();
+  Refresh();
+}
+
+void RootWindow::SetLeftTitle(const std::string& title) { _leftTitle->SetText(title); }
+
+void RootWindow::SetRightTitle(const std::string& title) { _rightTitle->SetText(title); }
+
+void RootWindow::SetLeftHint(const std::string& hint) { _leftHint->SetText(hint); }
+
+void RootWindow::SetRightHint(const std::string& hint) { _rightHint->SetText(hint); }
+
+}  // namespace Tarnel
