@@ -21,11 +21,16 @@ ItemList::ItemList(Window* parent, int x, int y, int width, int height)
   for (int row = 0; row < height; ++row) {
     Window* const window =
         _listPane->CreateChild(0, row, rowWidth, 1, PARENT_COLOUR, PARENT_COLOUR);
+    _rowWindows.push_back(window);
     _rowTexts.push_back(window->Add<TextArea>(1, 0, rowWidth - 2, 1, PARENT_COLOUR));
   }
 }
 
 void ItemList::SetItems(const std::vector<Item*>& items) {
+  // Rows below the last item are left alone: the screen may have put a hint there.
+  for (size_t row = items.size(); row < std::min(_items.size(), _rowWindows.size()); ++row) {
+    _rowWindows[row]->Erase();
+  }
   _items = items;
   _top = 0;
   _selectionIndex = 0;
@@ -83,7 +88,6 @@ void ItemList::MoveDown() {
 
 // The focused item comes last: a field leaves the cursor where it is edited.
 void ItemList::Repaint() {
-  Erase();
   DrawRows();
   if (Count() > Rows()) {
     DrawScrollBar();

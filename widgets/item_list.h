@@ -44,6 +44,7 @@ class ItemList : public Window {
   Window* _barPane;
   std::vector<Item*> _items;
   std::vector<TextArea*> _rowTexts;
+  std::vector<Window*> _rowWindows;
   int _focusRow = 0;
   int _top = 0;
   int _selectionIndex = 0;
