@@ -1,11 +1,17 @@
 #include "login/welcome_window.h"
 
+#include <syslog.h>
+
 #include <cstdlib>
 
+#include "customization/general_window.h"
 #include "hostapi/coreplane/network_info.h"
 #include "hostapi/kernel.h"
 #include "hostapi/nodeplane/exception.h"
 #include "hostops/command_runner.h"
+#include "hostops/shutdown_dialogs.h"
+#include "login/login_dialog.h"
+#include "login/login_disabled_dialog.h"
 #include "shell/colours.h"
 #include "shell/key_map.h"
 
@@ -40,6 +46,7 @@ int WelcomeWindow::Run() {
 
 void WelcomeWindow::HandleKey(int key) {
   if (key == F2_KEY || key == F12_KEY) {
+    LogInFor(key);
     return;
   }
   if (key == F4_KEY && can_change_color()) {
@@ -47,6 +54,42 @@ void WelcomeWindow::HandleKey(int key) {
   } else {
     clearok(curscr, TRUE);
   }
+  Draw();
+}
+
+// The idle limit of every frame behind the login ends here.
+void WelcomeWindow::LogInFor(int key) {
+  try {
+    if (!LogIn()) {
+      return;
+    }
+    if (key == F2_KEY) {
+      Customize();
+    } else {
+      ShutdownDialog(this).Exec();
+      Draw();
+    }
+  } catch (const TarnelTimeout&) {
+    Activate(true);
+    Draw();
+  }
+}
+
+bool WelcomeWindow::LogIn() {
+  if (LoginDialog::IsLoginEnabled()) {
+    return LoginDialog(this).Exec() != 0;
+  }
+  return LoginDisabledDialog(this).Exec() != 0;
+}
+
+void WelcomeWindow::Customize() {
+  const std::string user = _loginName;
+  const bool hasPassword = LoginDialog::HasPassword(user);
+  SetLoggedIn(true);
+  GeneralWindow menu(this, hasPassword);
+  menu.Exec();
+  SetLoggedIn(false);
+  syslog(LOG_INFO, "User %s logged out.", _loginName.c_str());
   Draw();
 }
 

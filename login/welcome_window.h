@@ -24,6 +24,10 @@ class WelcomeWindow : public Frame {
   // Chooses the layout and fills it with facts that are read anew.
   void Draw();
   void HandleKey(int key);
+  // Logs an operator in and starts what the key stands for.
+  void LogInFor(int key);
+  bool LogIn();
+  void Customize();
 
   void BuildDefaultLayout();
   void FillDefaultLayout();

@@ -1,0 +1,36 @@
+#include "login/login_disabled_dialog.h"
+
+#include "hostapi/coreplane/ip_services.h"
+#include "shell/key_map.h"
+#include "widgets/hints.h"
+
+namespace Tarnel {
+
+namespace {
+
+constexpr int WIDTH = 60;
+constexpr int HEIGHT = 9;
+constexpr int HEADER_HEIGHT = 6;
+
+constexpr int TEXT_TITLE = 147;
+constexpr int TEXT_BODY = 148;
+
+}  // namespace
+
+LoginDisabledDialog::LoginDisabledDialog(Frame* parent)
+    : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT) {}
+
+int LoginDisabledDialog::Run() {
+  const Coreplane::Network::DnsConfigImpl dns("defaultTcpipStack");
+  SetTitle(_strings->GetString(TEXT_TITLE));
+  SetBody(_strings->GetString(TEXT_BODY) + dns.GetHostname() + "." + dns.GetDomain() + ".");
+  SetFooter(HINT_OK);
+  int key = 0;
+  while (key != ENTER_KEY && key != ESC_KEY) {
+    key = WaitKey(true);
+  }
+  Activate(false);
+  return 0;
+}
+
+}  // namespace Tarnel
