@@ -60,21 +60,19 @@ class LentTerminal {
     tcgetattr(STDOUT_FILENO, &_modes);
     tcsetattr(STDOUT_FILENO, TCSANOW, &orig_termios);
   }
-  ~LentTerminal() {
-    tcsetattr(STDOUT_FILENO, TCSANOW, &_modes);
-    TakeForeground();
-  }
+  ~LentTerminal() { TakeBack(); }
   LentTerminal(const LentTerminal&) = delete;
   LentTerminal& operator=(const LentTerminal&) = delete;
 
  private:
-  // From the background, where the pager has put the console, this would stop the process.
-  static void TakeForeground() {
+  // From the background, where the pager has put the console, each of these calls would stop it.
+  void TakeBack() const {
     sigset_t stop;
     sigset_t before;
     sigemptyset(&stop);
     sigaddset(&stop, SIGTTOU);
     pthread_sigmask(SIG_BLOCK, &stop, &before);
+    tcsetattr(STDOUT_FILENO, TCSANOW, &_modes);
     tcsetpgrp(STDOUT_FILENO, getpgid(0));
     pthread_sigmask(SIG_SETMASK, &before, nullptr);
   }
