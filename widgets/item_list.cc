@@ -31,6 +31,9 @@ void ItemList::SetItems(const std::vector<Item*>& items) {
   for (size_t row = items.size(); row < std::min(_items.size(), _rowWindows.size()); ++row) {
     _rowWindows[row]->Erase();
   }
+  if (items.size() <= _rowWindows.size()) {
+    _barPane->Erase();
+  }
   _items = items;
   _top = 0;
   _selectionIndex = 0;
@@ -93,6 +96,7 @@ void ItemList::Repaint() {
     DrawScrollBar();
   }
   _listPane->Refresh();
+  _barPane->Refresh();
   DrawFocusedItem();
 }
 
@@ -124,7 +128,6 @@ void ItemList::DrawScrollBar() {
     _barPane->PutText(0, row, BAR);
   }
   _barPane->PutText(0, static_cast<int>((rows - 1) * percent / 100), THUMB);
-  _barPane->Refresh();
 }
 
 }  // namespace Tarnel

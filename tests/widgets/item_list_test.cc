@@ -149,7 +149,9 @@ TEST_F(ItemListTest, MovesTheFocusOverWhatCannotTakeIt) {
 }
 
 TEST_F(ItemListTest, HasNoBarWhenAllFits) {
-  for (int item = 0; item < ROWS; ++item) Add<LabelItem>("row", item > 0);
+  for (int item = 0; item <= ROWS; ++item) Add<LabelItem>("row", item > 0);
+  Show();
+  _items.pop_back();
   Show();
   EXPECT_EQ(_screen.Picture(), " row\n row\n row\n");
   EXPECT_EQ(_list->FocusIndex(), 1);
