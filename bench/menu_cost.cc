@@ -1,0 +1,274 @@
+// Measures the console behind a login, in a lab: what a key costs in the menu and in forms, the
+// bytes of a focus move beside those that curses needs for it, and the memory over many keys.
+
+#include <curses.h>
+
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <cwchar>
+#include <fstream>
+#include <random>
+#include <stdexcept>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "shell/colours.h"
+#include "tests/support/curses_screen.h"
+#include "tests/support/lab.h"
+#include "tests/support/terminal.h"
+
+namespace {
+
+using namespace Tarnel::Testing;
+using std::chrono::steady_clock;
+
+constexpr int COLUMNS = 80;
+constexpr int ROWS = 25;
+constexpr char DOWN[] = "\x1b[B";
+constexpr char UP[] = "\x1b[A";
+constexpr char ENTER[] = "\r";
+constexpr char BACKSPACE[] = "\x7f";
+
+std::string StatusLine(pid_t pid, const std::string& name) {
+  std::ifstream status("/proc/" + std::to_string(pid) + "/status");
+  for (std::string line; std::getline(status, line);) {
+    if (line.starts_with(name + ":")) return line.substr(name.size() + 1);
+  }
+  throw std::runtime_error("the console has ended");
+}
+
+long Number(pid_t pid, const std::string& name) { return std::stol(StatusLine(pid, name)); }
+
+// What a settled screen shows.
+struct Shown {
+  std::vector<CellRow> rows;
+  int cursorX;
+  int cursorY;
+};
+
+// The console with an operator logged in.
+class Session : public Terminal {
+ public:
+  Session() {
+    Expect("<F2> Customize");
+    Type(Keys::F2);
+    Expect("<Esc> Cancel");
+    Settle();
+    Type("root\tlaboratory\r");
+    Expect("System Customization");
+    Settle();
+  }
+
+  void Expect(const std::string& text) {
+    if (!WaitFor(text)) throw std::runtime_error("the console does not show " + text);
+  }
+
+  // Milliseconds from the key to the last byte that it brought.
+  double TimeOf(const std::string& key) {
+    constexpr std::chrono::milliseconds QUIET(15);
+    const size_t before = Output().size();
+    size_t seen = before;
+    const auto start = steady_clock::now();
+    auto last = start;
+    Type(key);
+    WaitUntil(
+        [&] {
+          const auto now = steady_clock::now();
+          last = Output().size() != seen ? now : last;
+          seen = Output().size();
+          return seen != before && now - last > QUIET;
+        },
+        "what a key brings");
+    return std::chrono::duration<double, std::milli>(last - start).count();
+  }
+
+  size_t BytesOf(const std::string& key) {
+    const size_t before = Output().size();
+    Type(key);
+    Settle();
+    return Output().size() - before;
+  }
+
+  // Types a key and waits until the console sleeps again.
+  void TypeAndWait(const std::string& key) {
+    const long before = Wakes();
+    Type(key);
+    WaitUntil([&] { return Wakes() != before && Sleeps(); }, "the end of a key");
+  }
+
+  bool IsInMenu() const {
+    return At(3, 1).bg == Tarnel::YELLOW && Row(1).find("System Customization") == 3;
+  }
+
+  void OpenRow(size_t row) {
+    for (size_t move = 0; move < row; ++move) TimeOf(DOWN);
+    Type(ENTER);
+    Expect("<Esc> Cancel");
+    Settle();
+  }
+
+  void CloseForm() {
+    Type(Keys::ESC);
+    if (!WaitUntil([this] { return IsInMenu(); }, "the menu")) {
+      throw std::runtime_error("a form does not close");
+    }
+    Settle();
+  }
+
+  Shown Look() const {
+    Shown shown{{}, CursorX(), CursorY()};
+    for (int y = 0; y < ROWS; ++y) shown.rows.push_back(Cells(y));
+    return shown;
+  }
+
+ private:
+  long Wakes() const { return Number(Pid(), "voluntary_ctxt_switches"); }
+  bool Sleeps() const { return StatusLine(Pid(), "State").find('S') != std::string::npos; }
+};
+
+void PrintTimes(const char* what, std::vector<double> times) {
+  std::sort(times.begin(), times.end());
+  const auto at = [&](double part) { return times[size_t(part * double(times.size() - 1))]; };
+  printf("  %-34s %7.3f ms median %7.3f ms p99 (n=%zu)\n", what, at(0.5), at(0.99), times.size());
+}
+
+// Types the keys over and over.
+std::vector<double> TimesOf(Session& session, const std::vector<std::string>& keys, size_t count) {
+  std::vector<double> times;
+  while (times.size() < count) times.push_back(session.TimeOf(keys[times.size() % keys.size()]));
+  return times;
+}
+
+std::vector<std::string> ThereAndBack(const char* there, const char* back, size_t steps) {
+  std::vector<std::string> keys(steps, there);
+  keys.insert(keys.end(), steps, back);
+  return keys;
+}
+
+constexpr size_t MENU_MOVES = 10;
+
+constexpr size_t KEYBOARD_ROW = 6;
+
+void MeasureKeys() {
+  constexpr size_t COUNT = 600;
+  printf("a key to the painted screen\n");
+  Session session;
+  PrintTimes("menu, Down and Up", TimesOf(session, ThereAndBack(DOWN, UP, MENU_MOVES), COUNT));
+  session.OpenRow(0);
+  PrintTimes("password form, typing", TimesOf(session, ThereAndBack("x", BACKSPACE, 8), COUNT));
+  session.CloseForm();
+  session.OpenRow(KEYBOARD_ROW);
+  PrintTimes("keyboard form, Down and Up", TimesOf(session, ThereAndBack(DOWN, UP, 9), COUNT));
+}
+
+chtype LineCharacter(const std::string& shape) {
+  return shape == "-" ? ACS_HLINE : shape == "|" ? ACS_VLINE : ACS_PLUS;
+}
+
+void Draw(const Shown& shown) {
+  for (size_t y = 0; y < shown.rows.size(); ++y) {
+    for (size_t x = 0; x < shown.rows[y].size(); ++x) {
+      const Cell& cell = shown.rows[y][x];
+      const attr_t attributes = cell.bg < 0 ? A_NORMAL : Tarnel::ColourAttr(cell.bg, cell.fg);
+      attrset(static_cast<int>(attributes));
+      if (cell.line) {
+        mvaddch(int(y), int(x), LineCharacter(cell.text) | attributes);
+      } else {
+        mvaddstr(int(y), int(x), cell.text.c_str());
+      }
+    }
+  }
+  move(shown.cursorY, shown.cursorX);
+  refresh();
+}
+
+// Bytes that curses needs to turn each screen into the one behind it.
+std::vector<size_t> BytesOfCurses(const std::vector<Shown>& screens) {
+  CursesScreen reference(COLUMNS, ROWS, "linux");
+  std::vector<size_t> bytes;
+  for (const Shown& screen : screens) {
+    Draw(screen);
+    bytes.push_back(reference.TakeOutput().size());
+  }
+  bytes.erase(bytes.begin());
+  return bytes;
+}
+
+void CompareBytes(const char* what, Session& session, const std::vector<std::string>& keys) {
+  std::vector<Shown> screens = {session.Look()};
+  std::vector<size_t> sent;
+  for (const std::string& key : keys) {
+    sent.push_back(session.BytesOf(key));
+    screens.push_back(session.Look());
+  }
+  const std::vector<size_t> needed = BytesOfCurses(screens);
+  double worst = 0;
+  size_t sentSum = 0;
+  size_t neededSum = 0;
+  for (size_t i = 0; i < sent.size(); ++i) {
+    worst = std::max(worst, double(sent[i]) / double(needed[i]));
+    sentSum += sent[i];
+    neededSum += needed[i];
+  }
+  printf("  %-34s %6zu sent, %6zu needed: %.3f times, at worst %.3f\n", what, sentSum, neededSum,
+         double(sentSum) / double(neededSum), worst);
+}
+
+void MeasureBytes() {
+  printf("bytes of focus moves\n");
+  Session session;
+  CompareBytes("menu", session, ThereAndBack(DOWN, UP, MENU_MOVES));
+  session.OpenRow(1);
+  CompareBytes("lockdown form", session, ThereAndBack(" ", " ", 2));
+  session.CloseForm();
+  session.OpenRow(KEYBOARD_ROW - 1);
+  CompareBytes("keyboard form", session, ThereAndBack(DOWN, UP, 9));
+}
+
+// Opens the focused row, works in what it opens and comes back.
+void VisitRow(Session& session, std::mt19937& random) {
+  const std::string keys[] = {UP, " ", "x", "\x1b[D"};
+  session.Type(ENTER);
+  session.Settle();
+  if (session.IsInMenu()) return;
+  for (int key = 0; key < 5; ++key) session.TypeAndWait(keys[random() % std::size(keys)]);
+  session.CloseForm();
+}
+
+void MeasureMemory(int count) {
+  constexpr unsigned VISIT_EVERY = 250;
+  const std::string keys[] = {DOWN,     UP,  DOWN, UP,        "\x1b[6~", "\x1b[5~",
+                              "\x1b[C", "x", "\t", "\x1b[1~", "\x1b[4~"};
+  Session session;
+  std::mt19937 random(1);
+  long early = 0;
+  for (int key = 0; key < count; ++key) {
+    if (key == count / 10) early = Number(session.Pid(), "VmRSS");
+    if (random() % VISIT_EVERY == 0) {
+      VisitRow(session, random);
+    } else {
+      session.TypeAndWait(keys[random() % std::size(keys)]);
+    }
+  }
+  const long late = Number(session.Pid(), "VmRSS");
+  printf("memory (RSS) over %d random keys\n  %ld KiB after a tenth, %+ld KiB at the end\n", count,
+         early, late - early);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  try {
+    LoadScenario("static");
+    MeasureKeys();
+    MeasureBytes();
+    MeasureMemory(argc > 1 ? atoi(argv[1]) : 100000);
+  } catch (const std::exception& error) {
+    fprintf(stderr, "%s\n", error.what());
+    return 2;
+  }
+  return 0;
+}
