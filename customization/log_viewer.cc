@@ -132,7 +132,6 @@ void RunPager(const char* path) {
   {
     const LentTerminal lent;
     clear();
-    refresh();
     UpdateScreen();
     const SecurePager secure;
     RunToItsEnd(path);
