@@ -186,6 +186,28 @@ TEST(SupportPages, AreLeafed) {
   EXPECT_NE(terminal.Row(4).find("1/3"), std::string::npos);
 }
 
+TEST(SupportPages, EndWithWhatWasGathered) {
+  const std::pair<const char*, const char*> files[] = {
+      {"", "1/1"}, {"#\n$ a\n\n$\n", "1/3"}, {"a\n$\nlast", "1/2"}};
+  for (const auto& [content, header] : files) {
+    SCOPED_TRACE(content);
+    LoadScenario("support-pages");
+    WriteFile("/etc/halvren/support", content);
+    Operator terminal;
+    terminal.GoTo("View Support Information");
+    EXPECT_EQ(terminal.Row(4).substr(58, 3), header);
+  }
+}
+
+TEST(Menu, IsRefreshedByItsSignal) {
+  LoadScenario("static");
+  Operator terminal;
+  terminal.GoTo("Configure Keyboard");
+  SetState(R"({"host": {"keyboard": {"configured": "Greek"}}})");
+  terminal.Signal(SIGUSR1);
+  terminal.WaitUntil([&] { return terminal.RightPane(4) == "Greek"; }, "the new layout");
+}
+
 // The digits follow the list on the screen, in which the log that does not exist has no number.
 TEST(LogViewer, HandsTheTerminalToThePager) {
   LoadScenario("logs");

@@ -3,6 +3,7 @@
 #include <curses.h>
 #include <gtest/gtest.h>
 
+#include <map>
 #include <memory>
 #include <vector>
 
@@ -87,6 +88,45 @@ TEST_F(ItemListTest, EditsAField) {
     EXPECT_EQ(item->Value(), edit.value);
     EXPECT_EQ(_screen.Row(0), std::string(" Name      [ ") + edit.shown + " ]");
     EXPECT_EQ(CursesScreen::CursorX(), 13 + edit.cursor);
+  }
+}
+
+struct ScrollCase {
+  const char* value;
+  const char* keys;  // Left, Right, Home, End, Backspace, Delete
+  const char* shown;
+  int cursor;
+};
+
+TEST_F(ItemListTest, ScrollsAFieldToItsCursor) {
+  const std::map<char, int> keys = {{'L', KEY_LEFT}, {'R', KEY_RIGHT},     {'H', KEY_HOME},
+                                    {'E', KEY_END},  {'B', KEY_BACKSPACE}, {'D', KEY_DC}};
+  const ScrollCase cases[] = {
+      {"12345678", "", "345678", 6},
+      {"12345678", "LLLLLL", "345678", 0},
+      {"12345678", "LLLLLLL", "234567", 0},
+      {"12345678", "H", "123456", 0},
+      {"12345678", "HRRRRRR", "123456", 6},
+      {"12345678", "HRRRRRRR", "234567", 6},
+      {"12345678", "LLLLLLLE", "345678", 6},
+      {"12345678", "HD", "234567", 0},
+      // A value that has become shorter than its field is shown from its start.
+      {"12345678", "EBB", "3456  ", 4},
+      {"12345678", "EBBB", "12345 ", 5},
+      // Columns are bytes.
+      {"\u00e9b", "", "\u00e9b    ", 3},
+  };
+  for (const ScrollCase& scroll : cases) {
+    SCOPED_TRACE(scroll.keys);
+    _items.clear();
+    auto* const item = Add<InputItem>("Name", scroll.value, 6);
+    Show();
+    for (const char* key = scroll.keys; *key != '\0'; ++key) {
+      item->HandleKey(keys.at(*key));
+      Paint();
+    }
+    EXPECT_EQ(_screen.Row(0), std::string(" Name      [ ") + scroll.shown + " ]");
+    EXPECT_EQ(CursesScreen::CursorX(), 13 + scroll.cursor);
   }
 }
 
