@@ -236,7 +236,9 @@ TEST(LogViewer, HandsTheTerminalToThePager) {
   EXPECT_FALSE(terminal.CursorVisible());
   EXPECT_TRUE(terminal.OnAlternateScreen());
   const termios after = terminal.Modes();
-  EXPECT_EQ(memcmp(&modes, &after, sizeof modes), 0);
+  EXPECT_EQ(after.c_iflag, modes.c_iflag);
+  EXPECT_EQ(after.c_oflag, modes.c_oflag);
+  EXPECT_EQ(after.c_lflag, modes.c_lflag);
   terminal.Press(DOWN);
   EXPECT_EQ(terminal.RightPane(1), "View Support Information");
 }
