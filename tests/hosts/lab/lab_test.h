@@ -4,6 +4,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <cstdio>
 #include <exception>
 #include <functional>
 #include <string>
@@ -52,4 +53,16 @@ inline std::string Thrown(const std::function<void()>& operation) {
     return std::string("state: ") + error.what();
   }
   return "none";
+}
+
+// What a shell command line printed, with "!" before the lines of standard error, and its status.
+inline std::string RunLine(const std::string& command) {
+  FILE* pipe = popen(
+      ("{ " + command + "; } 2>/tmp/errors; end=$?; sed 's/^/!/' /tmp/errors; echo \"= $end\"")
+          .c_str(),
+      "re");
+  std::string output;
+  for (int c = 0; (c = fgetc(pipe)) != EOF;) output += static_cast<char>(c);
+  pclose(pipe);
+  return output;
 }

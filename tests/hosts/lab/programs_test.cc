@@ -1,5 +1,3 @@
-#include <cstdio>
-
 #include "tests/hosts/lab/lab_test.h"
 
 namespace {
@@ -10,18 +8,6 @@ class ProgramsTest : public LabTest {};
 
 std::string StateAt(const char* pointer) {
   return Lab::ReadState()->at(Lab::Json::json_pointer(pointer)).dump();
-}
-
-// What a shell command line printed, with "!" before the lines of standard error, and its status.
-std::string RunLine(const std::string& command) {
-  FILE* pipe = popen(
-      ("{ " + command + "; } 2>/tmp/errors; end=$?; sed 's/^/!/' /tmp/errors; echo \"= $end\"")
-          .c_str(),
-      "re");
-  std::string output;
-  for (int c = 0; (c = fgetc(pipe)) != EOF;) output += static_cast<char>(c);
-  pclose(pipe);
-  return output;
 }
 
 TEST_F(ProgramsTest, TheAgentAnswersAndActs) {
@@ -84,6 +70,29 @@ TEST_F(ProgramsTest, RealOnesRunBehindTheirPaths) {
   EXPECT_EQ(RunLine("/bin/openssl x509 -in /etc/halvren/ssl/rui.crt -noout -subject"),
             "subject=CN = lab\n= 0\n");
   EXPECT_EQ(RunLine("echo text | /bin/less -"), "text\n= 0\n");
+}
+
+TEST_F(ProgramsTest, CardsAreMovedAndTheConsoleIsTold) {
+  struct Row {
+    const char* command;
+    const char* result;
+    const char* slots;
+  };
+  const Row rows[] = {
+      {"insert 1 '' root", "told\n= 0\n", R"([{},{"ids":["","root"]}])"},
+      {"insert 0 other", "told\n= 0\n", R"([{"ids":["other"]},{"ids":["","root"]}])"},
+      {"pull 1", "told\n= 0\n", R"([{"ids":["other"]},{}])"},
+      {"pull 16", "!lab: 16: no slot; they count from 0 to 15\n= 2\n", R"([{"ids":["other"]},{}])"},
+      {"insert 0", "!lab: card: insert SLOT ID ... or pull SLOT\n= 2\n",
+       R"([{"ids":["other"]},{}])"},
+  };
+  for (const auto& [command, result, slots] : rows) {
+    EXPECT_EQ(RunLine(std::string("trap 'echo told' USR1; echo $$ >/var/run/tarnel.pid; "
+                                  "/bin/lab card ") +
+                      command),
+              result);
+    EXPECT_EQ(StateAt("/hardware/cardSlots"), slots) << command;
+  }
 }
 
 // Else a file that is opened next would become standard output.
