@@ -167,16 +167,19 @@ bool IsLogOpen() {
 // The host's syslogd, from its first line on; ended with the object.
 class LogDaemon {
  public:
-  LogDaemon() : _pid(Start(SYSLOGD, Detach)) {
+  LogDaemon() { Begin(); }
+  LogDaemon(const LogDaemon&) = delete;
+  LogDaemon& operator=(const LogDaemon&) = delete;
+  ~LogDaemon() { kill(_pid, SIGTERM); }
+
+  void Begin() {
+    _pid = Start(SYSLOGD, Detach);
     const auto deadline = Clock::now() + LOG_DEADLINE;
     while (!(_ready = IsLogOpen()) && Clock::now() < deadline) {
       std::this_thread::sleep_for(milliseconds(1));
     }
   }
-  LogDaemon(const LogDaemon&) = delete;
-  LogDaemon& operator=(const LogDaemon&) = delete;
-  ~LogDaemon() { kill(_pid, SIGTERM); }
-
+  void End() { EndChild(_pid, SIGTERM); }
   bool IsReady() const { return _ready; }
 
  private:
@@ -187,7 +190,7 @@ class LogDaemon {
     for (const int fd : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) dup2(null, fd);
   }
 
-  pid_t _pid;
+  pid_t _pid = -1;
   bool _ready = false;
 };
 
@@ -224,8 +227,17 @@ int Pause(Clock::time_point start) {
   }
 }
 
+// What a restart of the host does besides a new console; gives a signal that ends the lab
+// meanwhile, else 0.
+int StartHostAfresh(LogDaemon& log) {
+  log.End();
+  const int signal = WaitFor(Start(START_AFRESH, [] {})).signal;
+  log.Begin();
+  return IsPowerSignal(signal) ? 0 : signal;
+}
+
 // Starts the console again and again until Ctrl-C, the end of the terminal, or a signal.
-int KeepConsole(const Terminal& terminal) {
+int KeepConsole(const Terminal& terminal, LogDaemon& log) {
   int signal = 0;
   while (signal == 0 && Terminal::IsThere()) {
     const auto start = Clock::now();
@@ -238,8 +250,7 @@ int KeepConsole(const Terminal& terminal) {
       return 0;
     }
     if (signal == REBOOT) {
-      WaitFor(Start(START_AFRESH, [] {}));
-      signal = 0;
+      signal = StartHostAfresh(log);
       continue;
     }
     if (signal == 0 && Terminal::IsThere()) signal = Pause(start);
@@ -258,12 +269,12 @@ int main(int, char** argv) {
   setrlimit(RLIMIT_NOFILE, &USUAL_DESCRIPTORS);
   // What the caller left open is no business of the lab.
   close_range(STDERR_FILENO + 1, ~0U, 0);
-  const LogDaemon log;
+  LogDaemon log;
   if (!log.IsReady()) {
     fprintf(stderr, "lab: syslogd does not start\n");
     return 1;
   }
   WritePidFile();
   const Terminal terminal;
-  return argv[1] == nullptr ? KeepConsole(terminal) : RunCommand(argv + 1, terminal);
+  return argv[1] == nullptr ? KeepConsole(terminal, log) : RunCommand(argv + 1, terminal);
 }

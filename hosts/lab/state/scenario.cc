@@ -123,7 +123,9 @@ void StartAfresh() {
     if (entry.path() != SUPERVISOR_FILE) fs::remove_all(entry.path());
   }
   const auto state = ReadState();
-  for (const auto& [path, entry] : state->value("files", Json::object()).items()) {
+  WriteNames(*state, "");
+  const Json files = state->value("files", Json::object());
+  for (const auto& [path, entry] : files.items()) {
     if (path.starts_with("/var/run/")) ApplyFile(entry, path);
   }
 }
