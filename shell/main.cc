@@ -1,9 +1,11 @@
 // The entry point: everything that has to be true before the first screen exists.
 
 #include <fcntl.h>
+#include <sys/resource.h>
 #include <syslog.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <csignal>
 #include <cstdlib>
 #include <memory>
@@ -37,6 +39,16 @@ void OccupyStandardDescriptors() {
 void IgnoreHangUp() {
   signal(SIGHUP, SIG_IGN);
   signal(SIGPIPE, SIG_IGN);
+}
+
+// The passwords that pass through this process may not end in a file. At a limit of one byte the
+// kernel also hands no core to a program, which it does at a limit of 0. A program that the console
+// starts may raise the limit again.
+void ForbidCoreDumps() {
+  rlimit limit{};
+  getrlimit(RLIMIT_CORE, &limit);
+  limit.rlim_cur = std::min<rlim_t>(1, limit.rlim_max);
+  setrlimit(RLIMIT_CORE, &limit);
 }
 
 int RequestedVirtualTerminal(int argc, char** argv) {
@@ -77,6 +89,7 @@ void RunConsole() {
 int main(int argc, char** argv) {
   OccupyStandardDescriptors();
   IgnoreHangUp();
+  ForbidCoreDumps();
   const int vt = RequestedVirtualTerminal(argc, argv);
   Frame::StartSignalThread();
   Frame::LoadIdleTimeout();
