@@ -1,5 +1,7 @@
 #include "hostops/pam.h"
 
+#include <malloc.h>
+
 #include <cstdlib>
 #include <cstring>
 #include <memory>
@@ -22,6 +24,19 @@ struct SecretDeleter {
 };
 using Secret = std::unique_ptr<char, SecretDeleter>;
 
+// A copy for a module of PAM, which frees it and often does not wipe it before. A block of this
+// size is given back to the kernel when it is freed, so nothing of it stays in the heap.
+char* CopyForModule(const char* secret) {
+  constexpr size_t BLOCK_OF_ITS_OWN = 1U << 20;
+  mallopt(M_MMAP_THRESHOLD, BLOCK_OF_ITS_OWN);
+  const size_t size = strlen(secret) + 1;
+  auto* const copy = static_cast<char*>(malloc(BLOCK_OF_ITS_OWN + size));
+  if (copy != nullptr) {
+    memcpy(copy, secret, size);
+  }
+  return copy;
+}
+
 // The responses to one call, until PAM takes them.
 class Responses {
  public:
@@ -41,7 +56,7 @@ class Responses {
   bool Made() const { return _responses != nullptr; }
   // False when there is no memory for the copy.
   bool Answer(int index, const char* text) {
-    _responses[index].resp = strdup(text);
+    _responses[index].resp = CopyForModule(text);
     return _responses[index].resp != nullptr;
   }
   pam_response* Release() {

@@ -1,5 +1,6 @@
 #include "widgets/input_item.h"
 
+#include <algorithm>
 #include <cctype>
 #include <cstring>
 
@@ -90,8 +91,9 @@ std::string InputItem::ShownPart(int columns) {
   if (cursor - static_cast<int>(_offset) > columns) {
     _offset = static_cast<size_t>(cursor - columns);
   }
-  std::string shown = _value.substr(_offset, static_cast<size_t>(columns));
-  return _masked ? std::string(shown.size(), '*') : shown;
+  const size_t count = std::min(_value.size() - _offset, static_cast<size_t>(columns));
+  // No part of a password is copied.
+  return _masked ? std::string(count, '*') : _value.substr(_offset, count);
 }
 
 void InputItem::Draw(TextArea* row) {
