@@ -13,7 +13,8 @@ TEST(Facts, OfNoMachineAreDefaults) {
   EXPECT_NE(facts.processor.model, "");
   EXPECT_EQ(facts.processor.sockets, 1);
   EXPECT_EQ(facts.memory.totalBytes, 0U);
-  EXPECT_TRUE(facts.adapters.empty());
+  // A lab that shares the machine's network sees the link in use, which no file tells of.
+  EXPECT_EQ(facts.adapters.size(), facts.management.name.empty() ? 0U : 1U);
   EXPECT_FALSE(facts.ipv6Enabled);
   EXPECT_EQ(facts.hostName.name, "localhost");
   EXPECT_TRUE(facts.pciDevices.empty());
