@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <string>
 
 // Services of the host's kernel.
 
@@ -79,5 +80,12 @@ class SysinfoUtil {
   // Sysnode_Get for a node with parameters (null: none); throws NodeplaneException on failure.
   static void SysinfoGet(SysinfoNode node, void* buffer, size_t size, const SysinfoParams* params);
 };
+
+// Runs a command line, words with blanks between them, to its end. The environment is empty and the
+// three standard descriptors are /dev/null unless a flag says otherwise: with keepOutput they are
+// the caller's, with ownGroup the child leads a process group of its own, with keepEnvironment it
+// has the caller's environment. Gives the exit code, 0 for success; throws NodeplaneException when
+// the program cannot be started.
+int Coreplane_Exec(std::string commandLine, bool keepOutput, bool ownGroup, bool keepEnvironment);
 
 }  // namespace Coreplane::Util

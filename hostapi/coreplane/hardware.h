@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "hostapi/nodeplane/pci_device.h"
 #include "hostapi/nodeplane/smart_card.h"
 
 namespace Coreplane::Hardware {
@@ -56,6 +57,32 @@ class MemoryInfoImpl {
   uint64_t GetTotalPages() const;
   // In bytes.
   uint64_t GetPageSize() const;
+
+ private:
+  struct Data;
+  std::unique_ptr<Data> _data;
+};
+
+// A PCI device of which the host knows the driver.
+class PciDeviceImpl : public Nodeplane::Hardware::PciDevice {
+ public:
+  ~PciDeviceImpl() override;
+  // "(Unknown)" when the device has none.
+  virtual std::string GetDriverName() const = 0;
+
+ protected:
+  PciDeviceImpl() = default;
+};
+
+class PciInfoImpl {
+ public:
+  PciInfoImpl();
+  ~PciInfoImpl();
+  PciInfoImpl(PciInfoImpl&&) noexcept;
+  PciInfoImpl& operator=(PciInfoImpl&&) noexcept;
+
+  // In the order of their addresses.
+  std::vector<std::unique_ptr<Nodeplane::Hardware::PciDevice>> GetAllPciDevices() const;
 
  private:
   struct Data;

@@ -6,6 +6,20 @@
 
 namespace Coreplane::System {
 
+// A named set of the host's firewall rules, made by the host. Every operation throws
+// NodeplaneException when it fails.
+class FirewallRuleset {
+ public:
+  virtual ~FirewallRuleset();
+  // The rules are opened and closed together with the service that they are for.
+  virtual bool FollowsService() const = 0;
+  virtual void Disable() = 0;
+  virtual void Enable() = 0;
+
+ protected:
+  FirewallRuleset() = default;
+};
+
 // Settings of the host as a whole. Every operation throws NodeplaneException when the host fails.
 class SystemInfoImpl {
  public:
@@ -28,9 +42,38 @@ class SystemInfoImpl {
   // Has the console's keyboard follow the layout from now on.
   void LoadKeyboardMappings(const std::string& layout) const;
 
+  // The firewall rules of this name; null when the host has none.
+  std::unique_ptr<FirewallRuleset> GetFirewallRulesetById(const std::string& id) const;
+
  private:
   struct Data;
   std::unique_ptr<Data> _data;
 };
 
+class KernelOpts {
+ public:
+  // An option of the kernel as it runs now; false when it has none of this name. Throws
+  // NodeplaneException when the host fails.
+  static bool GetRuntimeValueBool(const std::string& name);
+};
+
 }  // namespace Coreplane::System
+
+namespace Coreplane::Resource {
+
+// What runs on the host. Every operation throws NodeplaneException when the host fails.
+class ResourceInfoImpl {
+ public:
+  ResourceInfoImpl();
+  ~ResourceInfoImpl();
+  ResourceInfoImpl(ResourceInfoImpl&&) noexcept;
+  ResourceInfoImpl& operator=(ResourceInfoImpl&&) noexcept;
+
+  bool HasRunningVirtualMachines() const;
+
+ private:
+  struct Data;
+  std::unique_ptr<Data> _data;
+};
+
+}  // namespace Coreplane::Resource

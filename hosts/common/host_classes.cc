@@ -3,12 +3,20 @@
 
 #include "hostapi/coreplane/advanced_option.h"
 #include "hostapi/nodeplane/host.h"
+#include "hostapi/nodeplane/lattice.h"
 #include "hostapi/nodeplane/network_interface.h"
 
 namespace Nodeplane {
 
 Network::NetworkInterface::~NetworkInterface() = default;
 Network::CoreNic::~CoreNic() = default;
+
+Network::Portset::~Portset() = default;
+Network::ConnectionPoint::~ConnectionPoint() = default;
+Network::VirtualSwitch::~VirtualSwitch() = default;
+Network::PortGroup::~PortGroup() = default;
+Network::LatticeSwitch::~LatticeSwitch() = default;
+Network::LatticePort::~LatticePort() = default;
 
 Hardware::HardwareService::~HardwareService() = default;
 Storage::StorageAdapter::~StorageAdapter() = default;

@@ -100,12 +100,31 @@ Result PerformRead(const Call& call, Effect effect) {
   });
 }
 
-// Performs a call that changes the host; the effect gets the state to change.
+// Performs a call that changes the host; the effect gets the state to change. What it gives back, a
+// handle on what it made, is the call's result.
+template <class Result = void, class Effect>
+Result PerformChange(const Call& call, Effect effect) {
+  return WithHostExceptions(call, [&]() -> Result {
+    TraceChange(call);
+    return PerformWithFaults<Result>(*ReadState(), call, [&]() -> Result {
+      if constexpr (std::is_void_v<Result>) {
+        ChangeState(effect);
+      } else {
+        Result result;
+        ChangeState([&](Json& state) { result = effect(state); });
+        return result;
+      }
+    });
+  });
+}
+
+// Performs a call that changes nothing of the state: a file of the host, or only what an object
+// knows.
 template <class Effect>
-void PerformChange(const Call& call, Effect effect) {
+void PerformBesideState(const Call& call, Effect effect) {
   WithHostExceptions(call, [&] {
     TraceChange(call);
-    PerformWithFaults<void>(*ReadState(), call, [&] { ChangeState(effect); });
+    PerformWithFaults<void>(*ReadState(), call, effect);
   });
 }
 

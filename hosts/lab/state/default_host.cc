@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "hosts/lab/state/factory_network.h"
+
 namespace Lab {
 
 namespace {
@@ -32,7 +34,8 @@ Json BuiltInHost() {
     "files": {"/var/run/halvren/show-tarnel-login": {"content": ""}},
     "notary": {"init": 0},
     "hardware": {"bmc": "N/A", "storage": [], "drivers": {}, "cardSlots": []},
-    "network": {"kernelNics": {}},
+    "network": {"kernelNics": {}, "switches": {}, "lattices": {}, "netDumper": false},
+    "names": {}, "ping": {},
     "options": {
       "user": [],
       "advanced": {
@@ -153,16 +156,57 @@ Json RunningConfig(const Machine::ManagementInterface& nic) {
   return running;
 }
 
+// What the network would give the interface if it asked: the addresses that it has.
+Json Offers(const Machine::ManagementInterface& nic) {
+  Json offers = Json::object();
+  Json advertised = Json::array();
+  if (!nic.ipv4.address.empty()) {
+    offers["lease4"]["offer"] = {
+        {"address", nic.ipv4.address}, {"netmask", nic.ipv4.netmask}, {"gateway", nic.gateway4}};
+  }
+  for (const Machine::Ipv6& address : nic.ipv6) {
+    const Json text = Ipv6Node(address)["address"];
+    if (address.linkLocal) {
+      offers["linkLocal"] = text;
+    } else if (address.origin == Origin::DHCP) {
+      offers["lease6"] = {{"bound", true}, {"offer", {{"address", text}}}};
+    } else if (address.origin == Origin::AUTOCONF) {
+      advertised.push_back(text);
+    }
+  }
+  if (!advertised.empty()) {
+    offers["routerAdvertisement"] = {{"addresses", advertised}, {"gateway", nic.gateway6}};
+  }
+  return offers;
+}
+
 Json KernelNic(const Machine::ManagementInterface& nic) {
   Json stored = StoredConfig(nic);
   const bool bound = stored["dhcp"];
-  return {{"class", "CoreNic"},
-          {"mac", OrElse(nic.mac, "00:00:00:00:00:00")},
-          {"enabled", true},
-          {"configurable", true},
-          {"stored", std::move(stored)},
-          {"running", RunningConfig(nic)},
-          {"lease4", {{"bound", bound}}}};
+  Json node = {{"class", "CoreNicImpl"},
+               {"mac", OrElse(nic.mac, "00:00:00:00:00:00")},
+               {"enabled", true},
+               {"configurable", true},
+               {"stored", std::move(stored)},
+               {"running", RunningConfig(nic)},
+               {"connection", FactoryConnection()},
+               {"lease4", {{"bound", bound}}}};
+  node.merge_patch(Offers(nic));
+  return node;
+}
+
+// The adapter with the interface's address, else the first with a link, else the first.
+std::string ManagementAdapter(const Facts& facts) {
+  const auto& adapters = facts.adapters;
+  auto place = std::find_if(
+      adapters.begin(), adapters.end(),
+      [&facts](const Machine::Adapter& adapter) { return adapter.mac == facts.management.mac; });
+  if (place == adapters.end()) {
+    place = std::find_if(adapters.begin(), adapters.end(),
+                         [](const Machine::Adapter& adapter) { return adapter.linkUp; });
+  }
+  if (place == adapters.end()) place = adapters.begin();
+  return place == adapters.end() ? "" : place->name;
 }
 
 Json Stack(const Facts& facts) {
@@ -183,6 +227,7 @@ Json Stack(const Facts& facts) {
 Json Network(const Facts& facts) {
   Json network = {{"ipv6", {{"running", facts.ipv6Enabled}, {"nextStart", facts.ipv6Enabled}}},
                   {"pnics", Pnics(facts)},
+                  {"switches", FactorySwitches(ManagementAdapter(facts))},
                   {"stacks", {{"defaultTcpipStack", Stack(facts)}}}};
   if (!facts.management.name.empty()) {
     network["management"] = DEFAULT_NIC;

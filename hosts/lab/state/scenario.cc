@@ -5,6 +5,7 @@
 
 #include "hosts/lab/state/faults.h"
 #include "hosts/lab/state/files.h"
+#include "hosts/lab/state/kernel_nics.h"
 #include "hosts/lab/state/lock.h"
 #include "hosts/lab/state/trace.h"
 
@@ -64,17 +65,14 @@ std::string OwnHostsLine(const Json& state, const std::string& name) {
   return address + "\t" + (domain.empty() ? "" : name + "." + domain + " ") + name + "\n";
 }
 
-void TakeStoredConfig(Json& nic) {
-  for (const char* field : {"address", "netmask"}) {
-    if (nic["stored"].contains(field)) nic["running"][field] = nic["stored"][field];
-  }
-}
-
 void TakeStoredSettings(Json& state) {
   Json& network = state["network"];
   network["ipv6"]["running"] = Flag(network, "/ipv6/nextStart", false);
   for (Json& stack : network["stacks"]) stack["running"] = stack["stored"];
-  for (Json& nic : network["kernelNics"]) TakeStoredConfig(nic);
+  for (const auto& [name, nic] : network["kernelNics"].items()) {
+    TakeDownKernelNic(state, name);
+    BringUpKernelNic(state, name);
+  }
   for (Json& machine : state["virtualMachines"]) machine["running"] = false;
   Json& keyboard = state["host"]["keyboard"];
   keyboard["loaded"] = keyboard["configured"];

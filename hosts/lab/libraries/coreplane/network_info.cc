@@ -5,6 +5,7 @@
 
 #include "hosts/lab/libraries/coreplane/kernel_nic.h"
 #include "hosts/lab/libraries/perform.h"
+#include "hosts/lab/state/factory_network.h"
 
 namespace Coreplane::Network {
 
@@ -45,6 +46,27 @@ bool PnicImpl::IsLinkUp() const {
   });
 }
 
+std::unique_ptr<Nodeplane::Hardware::PciDevice> PnicImpl::GetPciDevice() const { return nullptr; }
+
+// The interfaces are read from the state when they are asked for.
+struct CorelinNicInfoImpl::Data {};
+
+CorelinNicInfoImpl::CorelinNicInfoImpl() = default;
+CorelinNicInfoImpl::~CorelinNicInfoImpl() = default;
+CorelinNicInfoImpl::CorelinNicInfoImpl(CorelinNicInfoImpl&&) noexcept = default;
+CorelinNicInfoImpl& CorelinNicInfoImpl::operator=(CorelinNicInfoImpl&&) noexcept = default;
+
+std::vector<std::unique_ptr<NetworkInterface>> CorelinNicInfoImpl::GetCorelinNics() const {
+  using Nics = std::vector<std::unique_ptr<NetworkInterface>>;
+  return Lab::PerformRead<Nics>({"CorelinNicInfoImpl::GetCorelinNics"}, [](const Json& state) {
+    Nics nics;
+    for (const auto& [name, node] : Lab::Object(state, "/network/kernelNics").items()) {
+      nics.push_back(Lab::MakeKernelNic(state, name));
+    }
+    return nics;
+  });
+}
+
 struct NetworkInfoImpl::Data {
   // As of the last update; none before the first.
   std::optional<std::string> management;
@@ -63,6 +85,11 @@ bool NetworkInfoImpl::IsCoreIpv6Enabled() const {
   return Lab::PerformRead<bool>({"NetworkInfoImpl::IsCoreIpv6Enabled"}, [](const Json& state) {
     return Lab::Flag(state, "/network/ipv6/running");
   });
+}
+
+void NetworkInfoImpl::SetCoreIpv6Enabled(bool enabled) {
+  Lab::PerformChange({"NetworkInfoImpl::SetCoreIpv6Enabled", "", {enabled ? "true" : "false"}},
+                     [enabled](Json& state) { state["network"]["ipv6"]["nextStart"] = enabled; });
 }
 
 void NetworkInfoImpl::UpdateManagementInterface() {
@@ -87,6 +114,19 @@ std::vector<std::unique_ptr<PnicImpl>> NetworkInfoImpl::GetPnics() const {
     }
     return pnics;
   });
+}
+
+void NetworkInfoImpl::DisableNetDumper() {
+  Lab::PerformChange({"NetworkInfoImpl::DisableNetDumper"},
+                     [](Json& state) { state["network"]["netDumper"] = false; });
+}
+
+void NetworkInfoImpl::ClearNetworkConfig() {
+  Lab::PerformChange({"NetworkInfoImpl::ClearNetworkConfig"}, Lab::ClearNetwork);
+}
+
+void NetworkInfoImpl::AutoConfigNetwork() {
+  Lab::PerformChange({"NetworkInfoImpl::AutoConfigNetwork"}, Lab::AutoConfigureNetwork);
 }
 
 }  // namespace Coreplane::Network
