@@ -91,6 +91,14 @@ int Frame::WaitKey(bool useIdleLimit) {
   }
 }
 
+int Frame::WaitKeyOrChild() {
+  sigset_t mask;
+  pthread_sigmask(SIG_SETMASK, nullptr, &mask);
+  sigdelset(&mask, SIGCHLD);
+  const int event = WaitEvent(nullptr, &mask);
+  return HandleEvent(event) ? event : static_cast<int>(EVENT_NONE);
+}
+
 bool Frame::HandleEvent(int event) {
   switch (event) {
     case EVENT_REDRAW:

@@ -38,7 +38,8 @@ class Frame : public Window {
   virtual void Redraw();
 
   // The signals of the table in signals.cc become bytes in a pipe from here on, in every thread.
-  // Called once, before any other thread is made. Ends the process with status 1 on failure.
+  // SIGCHLD is blocked along with them. Called once, before any other thread is made. Ends the
+  // process with status 1 on failure.
   static void StartSignalThread();
   // Reads the idle limit anew.
   static void LoadIdleTimeout();
@@ -52,8 +53,9 @@ class Frame : public Window {
   // Some inserted card carries this user id.
   static bool IsSmartCardPresent(const std::string& user);
 
-  // A key, or an Event. A null timeout waits for ever.
-  static int WaitEvent(timeval* timeout);
+  // A key, or an Event. A null timeout waits for ever. With a signal mask there is no timeout: that
+  // mask holds while the process sleeps, and a signal that was handled then gives EVENT_NONE.
+  static int WaitEvent(timeval* timeout, const sigset_t* mask = nullptr);
   // Takes the terminal's new size into curses and logs it.
   static void HandleResize();
 
@@ -64,6 +66,10 @@ class Frame : public Window {
   // The next key. Dims the frame after 60 seconds; with useIdleLimit it throws TarnelTimeout when
   // the idle limit is over. Signals are dealt with inside.
   int WaitKey(bool useIdleLimit);
+
+  // Waits for a key or for the end of a child process, which gives EVENT_NONE; SIGCHLD is handled
+  // nowhere else. Neither dims nor ends.
+  int WaitKeyOrChild();
 
   // Brings the smart card state up to date; ends the process when the card of the operator was
   // pulled.

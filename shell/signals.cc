@@ -88,7 +88,9 @@ void Frame::StartSignalThread() {
   for (const SignalByte& entry : SIGNAL_BYTES) {
     sigaddset(&_signalSet, entry.signal);
   }
-  errno = pthread_sigmask(SIG_BLOCK, &_signalSet, nullptr);
+  sigset_t blocked = _signalSet;
+  sigaddset(&blocked, SIGCHLD);
+  errno = pthread_sigmask(SIG_BLOCK, &blocked, nullptr);
   if (errno != 0) {
     LogErrno("pthread_sigmask() failed");
   }
@@ -119,7 +121,7 @@ void* Frame::SignalHandler(void*) {
   }
 }
 
-int Frame::WaitEvent(timeval* timeout) {
+int Frame::WaitEvent(timeval* timeout, const sigset_t* mask) {
   UpdateScreen();
   // After a broken escape sequence curses holds keys that select does not see.
   if (const int key = ReadKey(); key != ERR) {
@@ -129,9 +131,13 @@ int Frame::WaitEvent(timeval* timeout) {
   FD_ZERO(&ready);
   FD_SET(STDIN_FILENO, &ready);
   FD_SET(_signalPipe[0], &ready);
-  const int count =
-      select(std::max(STDIN_FILENO, _signalPipe[0]) + 1, &ready, nullptr, nullptr, timeout);
+  const int last = std::max(STDIN_FILENO, _signalPipe[0]);
+  const int count = mask == nullptr ? select(last + 1, &ready, nullptr, nullptr, timeout)
+                                    : pselect(last + 1, &ready, nullptr, nullptr, nullptr, mask);
   if (count < 0) {
+    if (mask != nullptr && errno == EINTR) {
+      return EVENT_NONE;
+    }
     LogErrno("select() failed");
     return NothingRead();
   }
