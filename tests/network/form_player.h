@@ -1,0 +1,46 @@
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <string>
+
+#include "shell/frame.h"
+#include "tests/shell/fake_time.h"
+#include "tests/shell/signal_thread.h"
+#include "tests/support/curses_screen.h"
+
+namespace Tarnel::Testing {
+
+inline constexpr char UP[] = "\x1b[A";
+inline constexpr char DOWN[] = "\x1b[B";
+inline constexpr char END[] = "\x1b[4~";
+inline constexpr char BACKSPACE[] = "\x7f";
+
+// Forms on a screen in process, and the operator in front of them, who types each key only when
+// the last one has been dealt with.
+class FormPlayer : public testing::Test {
+ protected:
+  using Opening = std::function<int(Frame*)>;
+
+  // Opens a form, types the keys and gives the form's result. A form that ends before the last key
+  // is a test failure, one that waits for more ends with TarnelTimeout.
+  int Play(const std::string& keys, const Opening& open);
+
+  bool HasShown(const std::string& text) const { return _seen.find(text) != std::string::npos; }
+
+  // Of all screens that a key was typed on: their text, and '|' for a visible cursor or '.' for
+  // none.
+  std::string _seen;
+  std::string _cursors;
+
+ private:
+  void LookAndType(const std::string& key);
+
+  SignalThread _signalThread;
+
+ protected:
+  CursesScreen _screen{80, 25};
+};
+
+}  // namespace Tarnel::Testing
