@@ -195,19 +195,13 @@ std::string GeneralWindow::ConfiguredAddressText() const {
 }
 
 std::string GeneralWindow::Ipv6Text() const {
-  constexpr size_t MAX_LINES = 3;
   if (!Coreplane::Network::NetworkInfoImpl().IsCoreIpv6Enabled()) {
     return "";
   }
   std::string text = Text(TEXT_IPV6_ADDRESSES) + ":\n";
   try {
     if (const auto nic = LookupManagementInterface(); nic != nullptr) {
-      const auto networks = nic->GetRunningIpConfig().GetIpv6Network();
-      const bool all = networks.size() <= MAX_LINES;
-      for (size_t i = 0; i < (all ? networks.size() : MAX_LINES - 1); ++i) {
-        text += networks[i].GetStringAddress() + "\n";
-      }
-      text += all ? "" : "...\n";
+      text += Ipv6Lines(nic->GetRunningIpConfig().GetIpv6Network());
     }
   } catch (const NodeplaneException&) {
     text += Text(TEXT_UNKNOWN) + "\n";

@@ -11,12 +11,17 @@
 #include "customization/menu_rows.h"
 #include "customization/support_pages.h"
 #include "hostapi/coreplane/advanced_option.h"
+#include "hostapi/nodeplane/exception.h"
 #include "hostapi/nodeplane/host.h"
 #include "hostops/command_runner.h"
 #include "hostops/restore_dialog.h"
 #include "login/change_password_dialog.h"
+#include "network/network_window.h"
+#include "network/restart_network_dialogs.h"
+#include "network/test_dialog.h"
 #include "shell/key_map.h"
 #include "shell/terminal.h"
+#include "widgets/message_dialog.h"
 
 namespace Tarnel {
 
@@ -179,6 +184,16 @@ void GeneralWindow::OpenRow() {
     case ROW_RESET:
       ResetHost();
       break;
+    case ROW_NETWORK:
+      NetworkWindow(this).Exec();
+      ShowScreen();
+      break;
+    case ROW_RESTART_NETWORK:
+      RestartNetwork();
+      break;
+    case ROW_TEST_NETWORK:
+      TestDialog(this).Exec();
+      break;
     default:
       break;
   }
@@ -194,6 +209,23 @@ void GeneralWindow::ChangePassword() {
 void GeneralWindow::ChangeLockdown() {
   if (LockdownDialog(this).Exec() != 0) {
     _lockdownEnabled = QueryStewBool(LOCKDOWN_IS_ENABLED);
+  }
+  ShowScreen();
+}
+
+void GeneralWindow::RestartNetwork() {
+  constexpr int TEXT_ERROR_TITLE = 17;
+  constexpr int TEXT_NO_INTERFACE = 20;
+  constexpr int TEXT_FAILED = 21;
+  try {
+    const auto nic = LookupManagementInterface();
+    if (nic == nullptr) {
+      MessageDialog(this, TEXT_ERROR_TITLE, TEXT_NO_INTERFACE).Exec();
+    } else {
+      RestartNetworkDialog(this, nic.get()).Exec();
+    }
+  } catch (const Nodeplane::Lib::NodeplaneException&) {
+    MessageDialog(this, TEXT_ERROR_TITLE, TEXT_FAILED).Exec();
   }
   ShowScreen();
 }

@@ -36,6 +36,7 @@ class GeneralWindow : public RootWindow {
   void OpenRow();
   void ChangePassword();
   void ChangeLockdown();
+  void RestartNetwork();
   void ResetHost();
   void ViewLog(int number);
 

@@ -44,6 +44,16 @@ void RootWindow::ShowScreen() {
   Refresh();
 }
 
+std::string RootWindow::Ipv6Lines(const std::vector<Nodeplane::Network::Ipv6Network>& networks) {
+  constexpr size_t MAX_LINES = 3;
+  const bool all = networks.size() <= MAX_LINES;
+  std::string lines;
+  for (size_t i = 0; i < (all ? networks.size() : MAX_LINES - 1); ++i) {
+    lines += networks[i].GetStringAddress() + "\n";
+  }
+  return all ? lines : lines + "...\n";
+}
+
 void RootWindow::SetLeftTitle(const std::string& title) { _leftTitle->SetText(title); }
 
 void RootWindow::SetRightTitle(const std::string& title) { _rightTitle->SetText(title); }

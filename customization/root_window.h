@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "hostapi/coreplane/ip_services.h"
 #include "hostapi/coreplane/switch_info.h"
@@ -21,6 +22,9 @@ class RootWindow : public Frame {
   void ShowScreen();
   // Repaints what depends on the host: the list, both hints, the right pane.
   virtual void RefreshPanes() = 0;
+
+  // Each address on a line of its own; of more than three, two and a line that says so.
+  static std::string Ipv6Lines(const std::vector<Nodeplane::Network::Ipv6Network>& networks);
 
   void SetLeftTitle(const std::string& title);
   void SetRightTitle(const std::string& title);

@@ -1,0 +1,33 @@
+#pragma once
+
+#include <string>
+
+#include "hostapi/nodeplane/exception.h"
+#include "widgets/dialog.h"
+
+namespace Tarnel {
+
+// Asks whether the pending changes of the management network are to be applied. Gives 0 for Esc,
+// 1 for an answer.
+class ApplyChangesDialog : public Dialog {
+ public:
+  // rebootNeeded: what is pending takes a restart of the host.
+  ApplyChangesDialog(Frame* parent, bool rebootNeeded);
+
+  bool IsYes() const { return _yes; }
+
+ protected:
+  int Run() override;
+
+ private:
+  TextArea* _question;
+  bool _yes = false;
+  bool _rebootNeeded;
+};
+
+// The part of an exception's text that the operator sees: between the first "=" and the last ";".
+// Without a ";" it is empty, without a "=" it starts at the beginning; when the last ";" stands
+// before the first "=", it runs to the end.
+std::string ExtractErrorText(const Nodeplane::Lib::NodeplaneException& error);
+
+}  // namespace Tarnel
