@@ -34,8 +34,14 @@ Json BuiltInHost() {
     "files": {"/var/run/halvren/show-tarnel-login": {"content": ""}},
     "notary": {"init": 0},
     "hardware": {"bmc": "N/A", "storage": [], "drivers": {}, "cardSlots": []},
-    "network": {"kernelNics": {}, "switches": {}, "lattices": {}, "netDumper": false},
+    "network": {"kernelNics": {}, "switches": {}, "lattices": {}, "netDumper": false,
+                "rulesets": {"sshServer": {"follows": true, "on": false}}},
     "names": {}, "ping": {},
+    "services": {
+      "OstrelShell": {"running": false, "enabled": false},
+      "SSH": {"running": false, "enabled": false},
+      "stewardd": {"running": true, "enabled": true}
+    },
     "options": {
       "user": [],
       "advanced": {

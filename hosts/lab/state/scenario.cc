@@ -74,6 +74,7 @@ void TakeStoredSettings(Json& state) {
     BringUpKernelNic(state, name);
   }
   for (Json& machine : state["virtualMachines"]) machine["running"] = false;
+  for (Json& service : state["services"]) service["running"] = Flag(service, "/enabled", false);
   Json& keyboard = state["host"]["keyboard"];
   keyboard["loaded"] = keyboard["configured"];
 }

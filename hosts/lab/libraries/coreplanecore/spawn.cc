@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "hostapi/kernel.h"
+#include "hosts/lab/libraries/coreplanecore/spawn.h"
 #include "hosts/lab/state/descriptor.h"
 #include "hosts/lab/state/programs.h"
 #include "hosts/lab/state/trace.h"
@@ -36,9 +36,11 @@ class Spawn {
     AddFlags(POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
   }
 
+  void LeadGroup() { AddFlags(POSIX_SPAWN_SETPGROUP); }
+
   // Before the descriptors are passed, which may take the terminal's place.
   void TakeForeground(int32_t terminal) {
-    AddFlags(POSIX_SPAWN_SETPGROUP);
+    LeadGroup();
     posix_spawn_file_actions_addtcsetpgrp_np(&_actions, terminal);
   }
 
@@ -102,13 +104,16 @@ bool LabAllows(const SpawnRequest& request) {
 
 }  // namespace
 
-SpawnResult Kernel_Spawn(const SpawnRequest& request) {
+SpawnResult Lab::SpawnProgram(const SpawnRequest& request, bool ownGroup) {
   if (!LabAllows(request)) return {-1, -ENOENT, -1};
   Spawn spawn;
   spawn.ResetSignals();
+  if (ownGroup) spawn.LeadGroup();
   if (request.terminal >= 0) spawn.TakeForeground(request.terminal);
   spawn.PassDescriptors(request.descriptors, request.descriptorCount);
   pid_t pid = -1;
   const int error = spawn.Start(request, &pid);
   return {error == 0 ? 0 : -1, -error, pid};
 }
+
+SpawnResult Kernel_Spawn(const SpawnRequest& request) { return Lab::SpawnProgram(request, false); }

@@ -35,12 +35,21 @@ constexpr Program PROGRAMS[] = {
     {"/sbin/reboot", Reboot, nullptr},
     {"/sbin/firmwareConfig.sh", FirmwareConfig, nullptr},
     {"/sbin/backup.sh", Backup, nullptr},
+    {"/sbin/ostrelcfg-advcfg", AdvancedConfig, nullptr},
+    {"/sbin/ostrelcli", SettingsTool, nullptr},
+    {"/sbin/nodecli", SettingsTool, nullptr},
+    {"/sbin/corebacktrace", CoreBacktrace, nullptr},
+    {"/sbin/services.sh", AgentsScript, nullptr},
+    {"/etc/init.d/OstrelShell", ServiceScript, nullptr},
+    {"/etc/init.d/SSH", ServiceScript, nullptr},
     {"/bin/openssl", nullptr, "/usr/libexec/lab/openssl"},
     {"/bin/less", nullptr, "/usr/libexec/lab/less"},
     {"/usr/lib/halvren/openssh/bin/ssh-keygen", nullptr, "/usr/libexec/lab/ssh-keygen"},
 };
 
 constexpr int CANNOT_RUN = 126;
+// A script is a file that the shell reads; what it becomes stands below this directory.
+constexpr char BEHIND_SCRIPTS[] = "/usr/libexec/lab";
 
 const Program* FindProgram(const char* path) {
   for (const Program& program : PROGRAMS) {
@@ -91,6 +100,10 @@ int End(const Outcome& outcome, const ProgramBehaviour& told) {
 int Main(const char* path, char** argv) {
   Words words;
   for (char** word = argv; *word != nullptr; ++word) words.emplace_back(*word);
+  if (strncmp(path, BEHIND_SCRIPTS, strlen(BEHIND_SCRIPTS)) == 0 && !words.empty()) {
+    path += strlen(BEHIND_SCRIPTS);
+    words[0] = path;
+  }
   const Program* program = FindProgram(path);
   if (program == nullptr || words.empty()) {
     fprintf(stderr, "%s: no program of this host\n", path);

@@ -25,6 +25,11 @@ Outcome PowerOff(const Words& words);
 Outcome Reboot(const Words& words);
 Outcome FirmwareConfig(const Words& words);
 Outcome Backup(const Words& words);
+Outcome ServiceScript(const Words& words);
+Outcome AgentsScript(const Words& words);
+Outcome AdvancedConfig(const Words& words);
+Outcome SettingsTool(const Words& words);
+Outcome CoreBacktrace(const Words& words);
 
 // Stops the virtual machines for which the choice is true.
 void StopVirtualMachines(bool (*choice)(const Json& machine));

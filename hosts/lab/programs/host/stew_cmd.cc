@@ -1,6 +1,7 @@
 // The management agent's client: stew-cmd -U USER COMMAND.
 
 #include "hosts/lab/programs/host/program.h"
+#include "hosts/lab/programs/host/services.h"
 
 namespace Lab::Host {
 
@@ -41,6 +42,18 @@ Outcome Autostop() {
   return {};
 }
 
+template <const char* SERVICE, bool RUNNING>
+Outcome Switch() {
+  SwitchByAgent(SERVICE, RUNNING);
+  return {};
+}
+
+template <const char* SERVICE, bool ENABLED>
+Outcome Configure() {
+  SetEnabled(SERVICE, ENABLED);
+  return {};
+}
+
 struct Command {
   const char* name;
   Outcome (*run)();
@@ -53,6 +66,14 @@ constexpr Command COMMANDS[] = {
     {"stewsvc/auth/lockdown_mode_exit", ExitLockdown},
     {"internalsvc/refresh", Refresh},
     {"hostsvc/autostartmanager/autostop", Autostop},
+    {"hostsvc/start_ostrel_shell", Switch<SHELL_SERVICE, true>},
+    {"hostsvc/stop_ostrel_shell", Switch<SHELL_SERVICE, false>},
+    {"hostsvc/enable_ostrel_shell", Configure<SHELL_SERVICE, true>},
+    {"hostsvc/disable_ostrel_shell", Configure<SHELL_SERVICE, false>},
+    {"hostsvc/start_ssh", Switch<SSH_SERVICE, true>},
+    {"hostsvc/stop_ssh", Switch<SSH_SERVICE, false>},
+    {"hostsvc/enable_ssh", Configure<SSH_SERVICE, true>},
+    {"hostsvc/disable_ssh", Configure<SSH_SERVICE, false>},
 };
 
 }  // namespace
@@ -61,6 +82,7 @@ Outcome StewCmd(const Words& words) {
   if (words.size() != 4 || words[1] != "-U") {
     return {1, "", "usage: stew-cmd -U USER COMMAND\n"};
   }
+  if (!IsRunning(AGENT_SERVICE)) return {1, "", "stew-cmd: the agent does not answer\n"};
   for (const Command& command : COMMANDS) {
     if (words[3] == command.name) return command.run();
   }
