@@ -21,6 +21,7 @@
 #include "network/test_dialog.h"
 #include "shell/key_map.h"
 #include "shell/terminal.h"
+#include "troubleshooting/troubleshooting_window.h"
 #include "widgets/message_dialog.h"
 
 namespace Tarnel {
@@ -179,6 +180,10 @@ void GeneralWindow::OpenRow() {
       break;
     case ROW_KEYBOARD:
       KeyboardDialog(this).Exec();
+      ShowScreen();
+      break;
+    case ROW_TROUBLESHOOTING:
+      TroubleShootingWindow(this).Exec();
       ShowScreen();
       break;
     case ROW_RESET:

@@ -1,0 +1,12 @@
+#include "troubleshooting/service_script.h"
+
+#include "hostops/command_runner.h"
+
+namespace Tarnel {
+
+int32_t RunServiceScript(const char* script, const char* action) {
+  const char* argv[] = {"sh", script, action, nullptr};
+  return RunCommand("/bin/sh", argv, nullptr, nullptr, nullptr, nullptr, nullptr, 0, 0);
+}
+
+}  // namespace Tarnel
