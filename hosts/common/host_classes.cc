@@ -5,6 +5,7 @@
 #include "hostapi/nodeplane/host.h"
 #include "hostapi/nodeplane/lattice.h"
 #include "hostapi/nodeplane/network_interface.h"
+#include "hostapi/nodeplane/pci_device.h"
 
 namespace Nodeplane {
 
@@ -19,6 +20,8 @@ Network::LatticeSwitch::~LatticeSwitch() = default;
 Network::LatticePort::~LatticePort() = default;
 
 Hardware::HardwareService::~HardwareService() = default;
+Hardware::PassthruDevice::~PassthruDevice() = default;
+Hardware::PciDevice::~PciDevice() = default;
 Storage::StorageAdapter::~StorageAdapter() = default;
 Storage::StorageService::~StorageService() = default;
 Driver::HostDriver::~HostDriver() = default;
