@@ -5,6 +5,7 @@
 
 #include <cstdlib>
 
+#include "customization/driver_vm_dialog.h"
 #include "customization/keyboard_dialog.h"
 #include "customization/lockdown_dialog.h"
 #include "customization/log_viewer.h"
@@ -19,6 +20,7 @@
 #include "network/network_window.h"
 #include "network/restart_network_dialogs.h"
 #include "network/test_dialog.h"
+#include "recovery/network_restore_window.h"
 #include "shell/key_map.h"
 #include "shell/terminal.h"
 #include "troubleshooting/troubleshooting_window.h"
@@ -177,6 +179,14 @@ void GeneralWindow::OpenRow() {
       break;
     case ROW_LOCKDOWN:
       ChangeLockdown();
+      break;
+    case ROW_DRIVER_VM:
+      DriverVMDialog(this).Exec();
+      ShowScreen();
+      break;
+    case ROW_RESTORE_NETWORK:
+      NetworkRestoreWindow(this).Exec();
+      ShowScreen();
       break;
     case ROW_KEYBOARD:
       KeyboardDialog(this).Exec();

@@ -1,0 +1,178 @@
+#include "recovery/safe_mode_network.h"
+
+#include <syslog.h>
+
+#include <algorithm>
+#include <memory>
+#include <vector>
+
+#include "hostapi/coreplane/network_info.h"
+#include "hostapi/coreplane/switch_info.h"
+#include "hostapi/nodeplane/exception.h"
+#include "hostops/command_runner.h"
+#include "shell/colours.h"
+#include "shell/key_map.h"
+#include "widgets/hints.h"
+
+namespace Tarnel {
+
+using Nodeplane::Lib::NodeplaneException;
+using Nodeplane::Network::NetworkInterface;
+using Nodeplane::Network::NicTeamingPolicy;
+using Nodeplane::Network::PortGroup;
+
+namespace {
+
+constexpr int WIDTH = 60;
+constexpr int HEIGHT = 12;
+constexpr int HEADER_HEIGHT = 7;
+
+constexpr int TEXT_TITLE = 138;
+constexpr int TEXT_BODY = 139;
+constexpr int TEXT_QUESTION = 140;
+
+// A host that gives no object has failed like one that throws.
+template <class T>
+std::unique_ptr<T> Given(std::unique_ptr<T> object) {
+  if (object == nullptr) {
+    throw NodeplaneException("The host gave no object");
+  }
+  return object;
+}
+
+std::vector<std::string> ReadUplinks(const NetworkInterface& nic) {
+  const auto portset = Given(Given(nic.GetConnectionPoint())->GetPortset());
+  return portset->GetUplinks();
+}
+
+// The prefix with the lowest number for which the host has nothing of that name.
+std::string FindFreeName(const std::string& prefix, bool (*isTaken)(const std::string& name)) {
+  for (int number = 0;; ++number) {
+    std::string name = prefix + std::to_string(number);
+    if (!isTaken(name)) {
+      return name;
+    }
+  }
+}
+
+std::unique_ptr<PortGroup> MakePortGroupOnNewSwitch() {
+  using namespace Coreplane::Network;
+  const std::string switchName = FindFreeName("softSwitch", PortsetImpl::IsValidVirtualSwitch);
+  const auto newSwitch = Given(VirtualSwitchInfoImpl().AddVirtualSwitch(
+      switchName, Nodeplane::Network::Portset::DEF_NUM_PORTS));
+  const std::string name = FindFreeName("Management Network", PortGroupImpl::IsValidPortGroup);
+  return Given(newSwitch->AddPortGroup(name));
+}
+
+void DisableAllInterfaces() {
+  for (const auto& nic : Coreplane::Network::CorelinNicInfoImpl().GetCorelinNics()) {
+    nic->Disable();
+  }
+}
+
+// A switch that refuses does not have the adapter.
+template <class Switches>
+void RemoveFromOneOf(const Switches& switches, const std::string& uplink) {
+  for (const auto& each : switches) {
+    try {
+      each->RemoveUplink(uplink, false);
+      return;
+    } catch (const NodeplaneException&) {
+    }
+  }
+}
+
+void AddToSwitch(const PortGroup& portGroup, const std::string& uplink) {
+  const auto newSwitch = Given(portGroup.GetVirtualSwitch());
+  NicTeamingPolicy policy = newSwitch->GetTeamingPolicy();
+  newSwitch->AddUplink(uplink);
+  if (AddUplinkToNewPolicy(uplink, policy)) {
+    newSwitch->SetTeamingPolicy(policy);
+  }
+}
+
+}  // namespace
+
+SafeModeNetworkDialog::SafeModeNetworkDialog(Frame* parent)
+    : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT),
+      _questionText(
+          _content->Add<TextArea>(0, 0, _content->Width(), _content->Height(), PARENT_COLOUR)) {}
+
+int SafeModeNetworkDialog::Run() {
+  SetTitle(_strings->GetString(TEXT_TITLE));
+  SetBody(_strings->GetString(TEXT_BODY));
+  _questionText->SetText(_strings->GetString(TEXT_QUESTION));
+  SetFooter(HINT_F11_OK);
+  for (;;) {
+    switch (WaitKey(true)) {
+      case F11_KEY:
+        MoveManagementToNewSwitch();
+        syslog(LOG_INFO, "%s",
+               "Enabling safe mode networking by moving all uplinks to a new management "
+               "softSwitch");
+        return 1;
+      case ESC_KEY:
+        return 0;
+      default:
+        break;
+    }
+  }
+}
+
+// The interfaces go down before anything moves, and the management interface comes up when its
+// uplinks are in place.
+void MoveManagementToNewSwitch() {
+  try {
+    const auto management = LookupManagementInterface();
+    if (management == nullptr) {
+      syslog(LOG_ERR, "Could not find the management network");
+      return;
+    }
+    const std::vector<std::string> uplinks = ReadUplinks(*management);
+    const auto newPortGroup = MakePortGroupOnNewSwitch();
+    DisableAllInterfaces();
+    management->SetConnectionPoint(newPortGroup.get(), false);
+    for (const std::string& uplink : uplinks) {
+      MoveUplinkToNewSwitch(newPortGroup.get(), uplink);
+    }
+    management->Enable();
+  } catch (const NodeplaneException& error) {
+    syslog(LOG_ERR, "Changing to legacy virtual switch failed: %s", error.what());
+  }
+}
+
+void MoveUplinkToNewSwitch(PortGroup* newPortGroup, const std::string& uplink) {
+  try {
+    const Coreplane::Network::VirtualSwitchInfoImpl switches;
+    RemoveFromOneOf(switches.GetVirtualSwitches(), uplink);
+    RemoveFromOneOf(switches.GetLatticeSwitches(), uplink);
+    AddToSwitch(*newPortGroup, uplink);
+  } catch (const NodeplaneException& error) {
+    syslog(LOG_ERR, "Moving uplink %s failed: %s", uplink.c_str(), error.what());
+  }
+}
+
+bool AddUplinkToNewPolicy(const std::string& uplink, NicTeamingPolicy& policy) {
+  try {
+    bool changed = false;
+    std::vector<std::string> order;
+    if ((policy.GetFieldMask() & NicTeamingPolicy::UPLINK_ORDER) != 0) {
+      order = policy.GetUplinkOrder();
+    }
+    if ((policy.GetFieldMask() & NicTeamingPolicy::MAX_ACTIVE_UPLINKS) != 0) {
+      policy.SetMaxActiveUplinks(policy.GetMaxActiveUplinks() + 1);
+      changed = true;
+    }
+    if (std::find(order.begin(), order.end(), uplink) == order.end()) {
+      order.push_back(uplink);
+      policy.SetUplinkOrder(order);
+      changed = true;
+    }
+    return changed;
+  } catch (const NodeplaneException& error) {
+    syslog(LOG_ERR, "VS: add uplink to teaming policy failed: %s", error.what());
+    return false;
+  }
+}
+
+}  // namespace Tarnel
