@@ -2,6 +2,7 @@
 
 #include <cctype>
 
+#include "network/address_text.h"
 #include "network/form_fields.h"
 #include "shell/key_map.h"
 #include "widgets/hints.h"
@@ -57,29 +58,11 @@ std::unique_ptr<IpAddress> Copy(const IpAddress* address) {
   return nullptr;
 }
 
-std::string Text(const IpAddress* address) {
-  return address == nullptr ? "" : address->GetStringAddress();
-}
-
 int AlternateLabel(const IpAddress* primary, const IpAddress* alternate) {
-  const bool mixed = primary != nullptr && primary->GetFamily() == IpAddress::IPV4 &&
-                     alternate != nullptr && alternate->GetFamily() == IpAddress::IPV6;
-  return mixed ? TEXT_IPV6_SERVER : TEXT_ALTERNATE;
+  return IsMixedPair(primary, alternate) ? TEXT_IPV6_SERVER : TEXT_ALTERNATE;
 }
 
-bool IsGoodServer(const std::string& text) {
-  return text.empty() || Ipv4Address::IsValidAddress(text) || Ipv6Address::IsValidAddress(text);
-}
-
-std::unique_ptr<IpAddress> ParseServer(const std::string& text) {
-  if (text.empty()) {
-    return nullptr;
-  }
-  if (Ipv6Address::IsValidAddress(text)) {
-    return std::make_unique<Ipv6Address>(text);
-  }
-  return std::make_unique<Ipv4Address>(text);
-}
+bool IsGoodServer(const std::string& text) { return text.empty() || IsValidAddress(text); }
 
 }  // namespace
 
@@ -95,9 +78,9 @@ DNSConfigurationDialog::DNSConfigurationDialog(Frame* parent, bool dhcpDns, bool
       _autoRadio(_strings->GetString(TEXT_AUTO), false),
       _manualRadio(_strings->GetString(TEXT_MANUAL), false),
       _blank("", false),
-      _primaryInput(_strings->GetString(TEXT_PRIMARY), Text(primary), DNS_FIELD_WIDTH),
-      _alternateInput(_strings->GetString(AlternateLabel(primary, alternate)), Text(alternate),
-                      DNS_FIELD_WIDTH),
+      _primaryInput(_strings->GetString(TEXT_PRIMARY), AddressText(primary), DNS_FIELD_WIDTH),
+      _alternateInput(_strings->GetString(AlternateLabel(primary, alternate)),
+                      AddressText(alternate), DNS_FIELD_WIDTH),
       _hostnameInput(_strings->GetString(TEXT_HOSTNAME), hostname, DNS_FIELD_WIDTH) {
   _autoRadio.SetEnabled(usingDhcp);
   _manualRadio.SetEnabled(usingDhcp);
@@ -186,8 +169,8 @@ bool DNSConfigurationDialog::Accept() {
   if (!AreServersGood()) {
     return false;
   }
-  _primaryDns = ParseServer(_primaryInput.Value());
-  _alternateDns = ParseServer(_alternateInput.Value());
+  _primaryDns = ParseAddress(_primaryInput.Value());
+  _alternateDns = ParseAddress(_alternateInput.Value());
   _hostname = _hostnameInput.Value();
   return true;
 }

@@ -1,14 +1,13 @@
 #include "network/test_dialog.h"
 
 #include <cctype>
-#include <cstring>
 
 #include "hostapi/coreplane/network_info.h"
 #include "network/address_text.h"
+#include "network/form_fields.h"
 #include "network/run_test_dialog.h"
 #include "shell/key_map.h"
 #include "widgets/hints.h"
-#include "widgets/message_dialog.h"
 
 namespace Tarnel {
 
@@ -23,10 +22,6 @@ constexpr int TEXT_RESOLVE_HOSTNAME = 218;
 
 constexpr char NETWORK_STACK[] = "defaultTcpipStack";
 constexpr int FIELD_WIDTH = 30;
-
-bool IsAddressKey(int key) {
-  return key > 0 && key < 128 && (isxdigit(key) != 0 || key == '.' || key == ':');
-}
 
 }  // namespace
 
@@ -99,7 +94,7 @@ int TestDialog::Run() {
 
 void TestDialog::Edit(int key) {
   const auto row = static_cast<size_t>(_list->SelectionIndex());
-  if (row < _addressInputs.size() && (IsAddressKey(key) || IsEditingKey(key))) {
+  if (row < _addressInputs.size() && IsFieldKey(key, isxdigit, ".:")) {
     _addressInputs[row]->HandleKey(key);
     _list->Repaint();
   } else if (row == _addressInputs.size() &&
@@ -113,9 +108,8 @@ bool TestDialog::ReadAddresses(Addresses& addresses) {
   for (size_t i = 0; i < _addressInputs.size(); ++i) {
     const std::string& text = _addressInputs[i]->Value();
     if (!text.empty() && !IsValidAddress(text)) {
-      _list->SelectItem(static_cast<int>(i));
-      MessageDialog(this, TEXT_BAD_ADDRESS_TITLE, TEXT_BAD_ADDRESS).Exec();
-      _list->Repaint();
+      RefuseField(this, _list, static_cast<int>(i), *_addressInputs[i], TEXT_BAD_ADDRESS_TITLE,
+                  TEXT_BAD_ADDRESS);
       return false;
     }
     addresses[i] = ParseAddress(text);

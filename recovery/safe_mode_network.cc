@@ -2,7 +2,6 @@
 
 #include <syslog.h>
 
-#include <algorithm>
 #include <memory>
 #include <vector>
 
@@ -10,6 +9,7 @@
 #include "hostapi/coreplane/switch_info.h"
 #include "hostapi/nodeplane/exception.h"
 #include "hostops/command_runner.h"
+#include "network/switch_operations.h"
 #include "shell/colours.h"
 #include "shell/key_map.h"
 #include "widgets/hints.h"
@@ -67,18 +67,6 @@ std::unique_ptr<PortGroup> MakePortGroupOnNewSwitch() {
 void DisableAllInterfaces() {
   for (const auto& nic : Coreplane::Network::CorelinNicInfoImpl().GetCorelinNics()) {
     nic->Disable();
-  }
-}
-
-// A switch that refuses does not have the adapter.
-template <class Switches>
-void RemoveFromOneOf(const Switches& switches, const std::string& uplink) {
-  for (const auto& each : switches) {
-    try {
-      each->RemoveUplink(uplink, false);
-      return;
-    } catch (const NodeplaneException&) {
-    }
   }
 }
 
@@ -143,9 +131,7 @@ void MoveManagementToNewSwitch() {
 
 void MoveUplinkToNewSwitch(PortGroup* newPortGroup, const std::string& uplink) {
   try {
-    const Coreplane::Network::VirtualSwitchInfoImpl switches;
-    RemoveFromOneOf(switches.GetVirtualSwitches(), uplink);
-    RemoveFromOneOf(switches.GetLatticeSwitches(), uplink);
+    DetachUplink(uplink);
     AddToSwitch(*newPortGroup, uplink);
   } catch (const NodeplaneException& error) {
     syslog(LOG_ERR, "Moving uplink %s failed: %s", uplink.c_str(), error.what());
@@ -154,21 +140,7 @@ void MoveUplinkToNewSwitch(PortGroup* newPortGroup, const std::string& uplink) {
 
 bool AddUplinkToNewPolicy(const std::string& uplink, NicTeamingPolicy& policy) {
   try {
-    bool changed = false;
-    std::vector<std::string> order;
-    if ((policy.GetFieldMask() & NicTeamingPolicy::UPLINK_ORDER) != 0) {
-      order = policy.GetUplinkOrder();
-    }
-    if ((policy.GetFieldMask() & NicTeamingPolicy::MAX_ACTIVE_UPLINKS) != 0) {
-      policy.SetMaxActiveUplinks(policy.GetMaxActiveUplinks() + 1);
-      changed = true;
-    }
-    if (std::find(order.begin(), order.end(), uplink) == order.end()) {
-      order.push_back(uplink);
-      policy.SetUplinkOrder(order);
-      changed = true;
-    }
-    return changed;
+    return AppendUplink(uplink, policy);
   } catch (const NodeplaneException& error) {
     syslog(LOG_ERR, "VS: add uplink to teaming policy failed: %s", error.what());
     return false;

@@ -4,6 +4,7 @@
 #include <optional>
 
 #include "hosts/lab/libraries/coreplane/kernel_nic.h"
+#include "hosts/lab/libraries/coreplane/pci_devices.h"
 #include "hosts/lab/libraries/perform.h"
 #include "hosts/lab/state/factory_network.h"
 
@@ -46,7 +47,12 @@ bool PnicImpl::IsLinkUp() const {
   });
 }
 
-std::unique_ptr<Nodeplane::Hardware::PciDevice> PnicImpl::GetPciDevice() const { return nullptr; }
+std::unique_ptr<Nodeplane::Hardware::PciDevice> PnicImpl::GetPciDevice() const {
+  return Lab::PerformRead<std::unique_ptr<Nodeplane::Hardware::PciDevice>>(
+      {"PnicImpl::GetPciDevice", _data->name}, [this](const Json& state) {
+        return Lab::MakePciDevice(state, Lab::Text(_data->Find(state), "/pci", ""));
+      });
+}
 
 // The interfaces are read from the state when they are asked for.
 struct CorelinNicInfoImpl::Data {};

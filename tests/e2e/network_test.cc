@@ -1,0 +1,283 @@
+// The screen of the management network: what it shows, what it writes to the host and what becomes
+// of a host that fails meanwhile.
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+
+#include "tests/support/lab.h"
+#include "tests/support/operator.h"
+
+namespace Tarnel::Testing {
+
+namespace {
+
+using Lines = std::vector<std::string>;
+
+constexpr char NETWORK_ROW[] = "Configure Management Network";
+const std::string DOWN = Keys::DOWN;
+const std::string ENTER = Keys::ENTER;
+
+std::string Down(int times) { return times == 0 ? "" : DOWN + Down(times - 1); }
+
+// The operator in front of the screen.
+class NetworkScreen : public Operator {
+ public:
+  NetworkScreen() {
+    GoTo(NETWORK_ROW);
+    Press({ENTER});
+  }
+
+  // Opens the row that many rows further down and types into its form.
+  void Edit(int rowsDown, const std::string& keys) {
+    Press({Down(rowsDown) + ENTER, keys + ENTER});
+  }
+
+  // Leaves the screen with a yes and confirms each message.
+  void Apply(const Lines& messages = {}) {
+    Press({Keys::ESC});
+    WaitFor("Apply changes and re");
+    Type("y");
+    for (const std::string& message : messages) {
+      WaitFor(message);
+      Settle();
+      Type(ENTER);
+    }
+  }
+};
+
+// What the console tells the log from here on, but for what it tells of itself.
+Lines Told(const Log& log) {
+  Lines told;
+  for (const LogLine& line : log.Lines()) {
+    const std::string text = line.text.substr(line.text.find(": ") + 2);
+    if (line.text.starts_with("TARNEL: ") && !text.starts_with("COLS=")) {
+      told.push_back((line.level == "user.err" ? "error: " : "") + text);
+    }
+  }
+  return told;
+}
+
+Lines TraceFrom(size_t start) {
+  const Lines lines = TraceLines();
+  return {lines.begin() + static_cast<ptrdiff_t>(std::min(start, lines.size())), lines.end()};
+}
+
+struct Pane {
+  const char* scenario;
+  int rowsDown;
+  const char* title;
+  Lines lines;
+};
+
+TEST(NetworkScreen, ShowsThePendingConfiguration) {
+  const Pane panes[] = {
+      {"sample", 0, "Network Adapters", {"corenic0 (Gigabit Network Adapter)", ""}},
+      {"sample", 1, "VLAN (optional)", {"Not set", ""}},
+      {"sample",
+       2,
+       "IPv4 Configuration",
+       {"Manual", "", "IPv4 Address: 192.0.2.20", "Subnet Mask: 255.255.255.0",
+        "Default Gateway: 192.0.2.1", ""}},
+      {"ipv4-none", 2, "IPv4 Configuration", {"None", "", "IPv4 Address: Not set"}},
+      {"dhcp", 2, "IPv4 Configuration", {"Automatic", "", "IPv4 Address: 192.0.2.77"}},
+      {"sample", 3, "IPv6 Configuration", {"IPv6 is disabled.", ""}},
+      {"ipv6",
+       3,
+       "IPv6 Configuration",
+       {"IPv6 is enabled.", "", "Automatic", "", "IPv6 Addresses:", "2001:db8::20/64",
+        "2001:db8:0:1:fc:ff:fe00:1/64", "...", "", "Default Gateway:"}},
+      {"sample",
+       4,
+       "DNS Configuration",
+       {"Manual", "", "Primary DNS Server:", "192.0.2.53", "Alternate DNS Server:", "Not set", "",
+        "Hostname", "rack7", ""}},
+      {"sample", 5, "Custom DNS Suffixes", {"example.com", ""}},
+  };
+  for (const Pane& pane : panes) {
+    SCOPED_TRACE(std::string(pane.scenario) + ": " + pane.title);
+    LoadScenario(pane.scenario);
+    NetworkScreen screen;
+    screen.Press({Down(pane.rowsDown)});
+    EXPECT_EQ(screen.RightPane(1), pane.title);
+    for (size_t i = 0; i < pane.lines.size(); ++i) {
+      EXPECT_EQ(screen.RightPane(4 + static_cast<int>(i)), pane.lines[i]);
+    }
+  }
+}
+
+TEST(NetworkScreen, OpensOnlyWithAnInterfaceOnAStandardOrDistributedSwitch) {
+  struct Row {
+    const char* scenario;
+    const char* patch;
+    const char* shown;
+    Lines told;
+  };
+  const Row rows[] = {
+      {"sample",
+       R"({"network": {"kernelNics": {"core0": {"connection": {"type": 3}}}}})",
+       "System Customization",
+       {"error: Getting uplinks failed: Unsupported softSwitch type"}},
+      {"sample",
+       R"({"network": {"kernelNics": {"core0": {"connection": {"type": 0}}}}})",
+       "System Customization",
+       {"error: Getting uplinks failed: Unsupported softSwitch type"}},
+      {"sample",
+       R"({"faults": [{"operation": "NetworkInfoImpl::GetManagementInterface", "returns": null}]})",
+       "Management network interface cannot be found.",
+       {"error: Could not get a suitable management interface"}},
+      {"sample",
+       R"({"faults": [{"operation": "NetworkInterface::GetRunningIpConfig", "message": "x"}]})",
+       "System Customization",
+       {}},
+  };
+  for (const Row& row : rows) {
+    SCOPED_TRACE(row.patch);
+    LoadScenario(row.scenario);
+    Operator terminal;
+    terminal.GoTo(NETWORK_ROW);
+    SetState(row.patch);
+    const Log log;
+    terminal.Press({ENTER});
+    terminal.WaitFor(row.shown);
+    EXPECT_EQ(Told(log), row.told);
+  }
+}
+
+// An uplink, the VLAN, the address, a name server with the host's name, and the suffixes.
+void ChangeEverything(NetworkScreen& screen) {
+  screen.Edit(0, DOWN + " ");
+  screen.Edit(1, "100");
+  screen.Edit(1, Down(3) + "192.0.2.30");
+  screen.Edit(2, "192.0.2.54" + Down(2) + "rack8.example.org");
+  screen.Edit(1, "a.example, b.example");
+}
+
+const Lines EVERYTHING = {
+    R"(VirtualSwitch::RemoveUplink softSwitch0 "corenic1" "false")",
+    R"(VirtualSwitch::AddUplink softSwitch0 "corenic1")",
+    R"(PortGroup::SetTeamingPolicy "Management Network" "mask 80 order corenic0 corenic1 max 2")",
+    R"(PortGroup::SetVlan "Management Network" "100")",
+    R"(NetworkInfoImpl::SetCoreIpv6Enabled "false")",
+    R"(NetworkInterface::SetIpConfig core0 "192.0.2.30 255.255.255.0" "ipv6" "dns manual")",
+    R"(RoutingInfoImpl::SetCorelinDefaultGateway defaultTcpipStack "192.0.2.1" "false")",
+    R"(NetworkInterface::Disable core0)",
+    R"(NetworkInterface::Refresh core0)",
+    R"(NetworkInterface::Enable core0)",
+    R"(DnsConfigImpl::SetFqdn defaultTcpipStack "rack8.example.org" "false" "")",
+    R"(DnsConfigImpl::RemoveNameServers defaultTcpipStack)",
+    R"(DnsConfigImpl::AddNameServer defaultTcpipStack "192.0.2.54")",
+    R"(DnsConfigImpl::SetSearchDomainsString defaultTcpipStack "example.org")",
+    R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "a.example")",
+    R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "b.example")",
+    R"(DnsConfigImpl::SaveConfig defaultTcpipStack)",
+    R"(program /bin/stew-cmd stew-cmd -U root internalsvc/refresh)",
+};
+
+struct Change {
+  const char* name;
+  const char* scenario;
+  const char* patch;
+  void (*edit)(NetworkScreen& screen);
+  Lines told;
+  Lines trace;
+};
+
+TEST(ApplyChanges, WritesWhatIsPendingInItsOrder) {
+  const Change changes[] = {
+      {"everything",
+       "sample",
+       "",
+       ChangeEverything,
+       {"Setting adapters to corenic0 corenic1",
+        "Setting ipv4 configuration to 192.0.2.30 255.255.255.0 on core0",
+        "Setting default gateway to 192.0.2.1", "Changed vlan, restarting management interface",
+        "Setting hostname to rack8.example.org", "Setting nameservers to 192.0.2.54 ",
+        "Setting suffixes to a.example, b.example", "Network settings changed."},
+       EVERYTHING},
+  };
+  for (const Change& change : changes) {
+    SCOPED_TRACE(change.name);
+    LoadScenario(change.scenario, change.patch);
+    NetworkScreen screen;
+    change.edit(screen);
+    const size_t start = TraceLines().size();
+    const Log log;
+    screen.Apply();
+    screen.WaitFor("System Customization");
+    EXPECT_EQ(TraceFrom(start), change.trace);
+    EXPECT_EQ(Told(log), change.told);
+  }
+}
+
+struct FailingStep {
+  const char* operation;
+  // What the operator confirms, empty for nothing.
+  std::string message;
+  // What the log tells of the failure.
+  std::string told;
+  // Beginnings of the lines of EVERYTHING that are missing, as the step's failure has it.
+  Lines missing;
+};
+
+bool IsAmong(const Lines& beginnings, const std::string& line) {
+  return std::any_of(beginnings.begin(), beginnings.end(),
+                     [&](const std::string& beginning) { return line.starts_with(beginning); });
+}
+
+TEST(ApplyChanges, GoesOnAfterAStepThatFails) {
+  const Lines restart = {"NetworkInterface::Disable", "NetworkInterface::Refresh",
+                         "NetworkInterface::Enable"};
+  const Lines afterFqdn = {"DnsConfigImpl::RemoveNameServers", "DnsConfigImpl::AddNameServer",
+                           "DnsConfigImpl::SetSearch", "DnsConfigImpl::AddSearch",
+                           "DnsConfigImpl::SaveConfig"};
+  const Lines afterDomain = {"DnsConfigImpl::SetSearch", "DnsConfigImpl::AddSearch",
+                             "DnsConfigImpl::SaveConfig"};
+  Lines vlanAndRestart = restart;
+  vlanAndRestart.emplace_back("PortGroup::SetVlan");
+  const FailingStep steps[] = {
+      {"VirtualSwitch::AddUplink",
+       "",
+       "Adding uplink corenic1 failed: a=broken;",
+       {"PortGroup::SetTeaming"}},
+      {"PortGroup::SetTeamingPolicy", "", "VS: add uplink to teaming policy failed: a=broken;", {}},
+      {"PortGroup::GetVlan", "", "Getting VlanID failed: a=broken;", vlanAndRestart},
+      {"PortGroup::SetVlan", "", "Setting VlanID failed: a=broken;", restart},
+      {"NetworkInterface::GetIpConfig",
+       "Setting ip configuration failed: broken",
+       "",
+       {"RoutingInfoImpl::SetCorelin"}},
+      {"NetworkInfoImpl::SetCoreIpv6Enabled", "Setting ipv6 configuration failed: broken", "", {}},
+      {"NetworkInterface::SetIpConfig", "Setting ip/ipv6 configuration failed: broken", "", {}},
+      {"RoutingInfoImpl::SetCorelinDefaultGateway",
+       "Setting default gateway failed: a=broken;",
+       "",
+       {}},
+      {"DnsConfigImpl::SetFqdn", "Setting DNS failed: broken", "", afterFqdn},
+      {"DnsConfigImpl::GetDomain", "Setting DNS failed: broken", "", afterDomain},
+      {"DnsConfigImpl::SaveConfig", "Setting DNS failed: broken", "", {}},
+  };
+  for (const FailingStep& step : steps) {
+    SCOPED_TRACE(step.operation);
+    LoadScenario("sample");
+    NetworkScreen screen;
+    ChangeEverything(screen);
+    SetState(R"({"faults": [{"operation": ")" + std::string(step.operation) +
+             R"(", "message": "a=broken;"}]})");
+    const size_t start = TraceLines().size();
+    const Log log;
+    screen.Apply(step.message.empty() ? Lines{} : Lines{step.message});
+    screen.WaitFor("System Customization");
+    Lines expected = EVERYTHING;
+    std::erase_if(expected, [&](const std::string& line) { return IsAmong(step.missing, line); });
+    EXPECT_EQ(TraceFrom(start), expected);
+    const Lines told = Told(log);
+    const std::string line = "error: " + (step.told.empty() ? step.message : step.told);
+    EXPECT_NE(std::find(told.begin(), told.end(), line), told.end()) << line;
+    EXPECT_EQ(told.back(), "Network settings changed.");
+  }
+}
+
+}  // namespace
+
+}  // namespace Tarnel::Testing

@@ -1,0 +1,39 @@
+#include "tests/support/operator.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+
+namespace Tarnel::Testing {
+
+Operator::Operator(const Launch& launch) : Terminal(launch) {
+  WaitFor("<F2> Customize");
+  Press({Keys::F2});
+  WaitFor("<Esc> Cancel");
+  Press({"root\tlaboratory\r"});
+  WaitFor("System Customization");
+  Settle();
+}
+
+void Operator::Press(const std::vector<std::string>& keys) {
+  for (const std::string& key : keys) {
+    Type(key);
+    Settle();
+  }
+}
+
+void Operator::GoTo(const std::string& title) {
+  constexpr int MOST_ROWS = 12;
+  for (int row = 0; row < MOST_ROWS && RightPane(1) != title; ++row) {
+    Press({Keys::DOWN});
+  }
+  EXPECT_EQ(RightPane(1), title);
+}
+
+std::string Operator::RightPane(int y) const {
+  std::string row = Row(y).substr(41, 38);
+  row.erase(row.find_last_not_of(' ') + 1);
+  return row.substr(std::min(row.find_first_not_of(' '), row.size()));
+}
+
+}  // namespace Tarnel::Testing

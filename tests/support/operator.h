@@ -1,0 +1,31 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "tests/support/terminal.h"
+
+namespace Tarnel::Testing {
+
+namespace Keys {
+inline constexpr char DOWN[] = "\x1b[B";
+inline constexpr char UP[] = "\x1b[A";
+inline constexpr char ENTER[] = "\r";
+inline constexpr char F11[] = "\x1b[23~";
+}  // namespace Keys
+
+// The console with an operator who is logged in and sees the menu.
+class Operator : public Terminal {
+ public:
+  explicit Operator(const Launch& launch = {});
+
+  // Types each and waits until the screen has settled: a frame that opens drops what was typed
+  // ahead of it.
+  void Press(const std::vector<std::string>& keys);
+  // Goes down to the row whose pane has this title.
+  void GoTo(const std::string& title);
+  // A row of the right pane without the blanks around it.
+  std::string RightPane(int y) const;
+};
+
+}  // namespace Tarnel::Testing
