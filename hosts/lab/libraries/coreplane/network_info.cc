@@ -11,6 +11,7 @@
 namespace Coreplane::Network {
 
 using Lab::Json;
+using Nodeplane::Hardware::PciDevice;
 using Nodeplane::Network::MacAddress;
 using Nodeplane::Network::NetworkInterface;
 
@@ -47,8 +48,8 @@ bool PnicImpl::IsLinkUp() const {
   });
 }
 
-std::unique_ptr<Nodeplane::Hardware::PciDevice> PnicImpl::GetPciDevice() const {
-  return Lab::PerformRead<std::unique_ptr<Nodeplane::Hardware::PciDevice>>(
+std::unique_ptr<PciDevice> PnicImpl::GetPciDevice() const {
+  return Lab::PerformRead<std::unique_ptr<PciDevice>>(
       {"PnicImpl::GetPciDevice", _data->name}, [this](const Json& state) {
         return Lab::MakePciDevice(state, Lab::Text(_data->Find(state), "/pci", ""));
       });

@@ -42,6 +42,7 @@ constexpr Program PROGRAMS[] = {
     {"/sbin/services.sh", AgentsScript, nullptr},
     {"/etc/init.d/OstrelShell", ServiceScript, nullptr},
     {"/etc/init.d/SSH", ServiceScript, nullptr},
+    {"/sbin/coreping", Coreping, nullptr},
     {"/bin/openssl", nullptr, "/usr/libexec/lab/openssl"},
     {"/bin/less", nullptr, "/usr/libexec/lab/less"},
     {"/usr/lib/halvren/openssh/bin/ssh-keygen", nullptr, "/usr/libexec/lab/ssh-keygen"},
@@ -90,9 +91,9 @@ Outcome Run(const Program& program, const Words& words, char** argv, const Progr
 int End(const Outcome& outcome, const ProgramBehaviour& told) {
   Write(STDOUT_FILENO, told.standardOutput.value_or(outcome.standardOutput));
   Write(STDERR_FILENO, told.standardError.value_or(outcome.standardError));
-  if (told.signal) {
-    signal(*told.signal, SIG_DFL);
-    raise(*told.signal);
+  if (const int fatal = told.signal.value_or(outcome.signal); fatal != 0) {
+    signal(fatal, SIG_DFL);
+    raise(fatal);
   }
   return told.exitCode.value_or(outcome.exitCode);
 }

@@ -16,6 +16,8 @@ struct Outcome {
   int exitCode = 0;
   std::string standardOutput = {};
   std::string standardError = {};
+  // Unless 0, the signal that it dies of.
+  int signal = 0;
 };
 
 // Each acts on the host's state as its name says.
@@ -30,6 +32,7 @@ Outcome AgentsScript(const Words& words);
 Outcome AdvancedConfig(const Words& words);
 Outcome SettingsTool(const Words& words);
 Outcome CoreBacktrace(const Words& words);
+Outcome Coreping(const Words& words);
 
 // Stops the virtual machines for which the choice is true.
 void StopVirtualMachines(bool (*choice)(const Json& machine));
