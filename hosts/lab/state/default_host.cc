@@ -230,6 +230,21 @@ Json Stack(const Facts& facts) {
   return {{"running", settings}, {"stored", settings}};
 }
 
+// What the network around the machine answers: its own name, and its name servers.
+Json Surroundings(const Facts& facts) {
+  Json names = Json::object();
+  Json ping = Json::object();
+  const auto& [host, domain] = facts.hostName;
+  const std::string name = domain.empty() ? host : host + "." + domain;
+  const std::string& address = facts.management.ipv4.address;
+  // A name that is no text cannot be a key.
+  if (!name.empty() && !address.empty() && TextNode(name).is_string()) {
+    names[name]["answers"] = Json::array({address});
+  }
+  for (const std::string& server : facts.resolver.nameServers) ping[server] = {{"exit", 0}};
+  return {{"names", names}, {"ping", ping}};
+}
+
 Json Network(const Facts& facts) {
   Json network = {{"ipv6", {{"running", facts.ipv6Enabled}, {"nextStart", facts.ipv6Enabled}}},
                   {"pnics", Pnics(facts)},
@@ -247,6 +262,7 @@ Json Network(const Facts& facts) {
 Json DefaultHost(const Facts& facts) {
   Json state = BuiltInHost();
   state.merge_patch({{"hardware", Hardware(facts)}, {"network", Network(facts)}});
+  state.merge_patch(Surroundings(facts));
   return state;
 }
 
