@@ -10,8 +10,6 @@
 namespace Tarnel {
 
 using Nodeplane::Network::IpAddress;
-using Nodeplane::Network::Ipv4Address;
-using Nodeplane::Network::Ipv6Address;
 
 namespace {
 
@@ -48,20 +46,6 @@ constexpr int TEXT_MANUAL = 127;
 constexpr int TEXT_SUFFIXES_BODY = 128;
 constexpr int TEXT_SUFFIXES = 129;
 
-std::unique_ptr<IpAddress> Copy(const IpAddress* address) {
-  if (const auto* ipv4 = dynamic_cast<const Ipv4Address*>(address)) {
-    return std::make_unique<Ipv4Address>(*ipv4);
-  }
-  if (const auto* ipv6 = dynamic_cast<const Ipv6Address*>(address)) {
-    return std::make_unique<Ipv6Address>(*ipv6);
-  }
-  return nullptr;
-}
-
-int AlternateLabel(const IpAddress* primary, const IpAddress* alternate) {
-  return IsMixedPair(primary, alternate) ? TEXT_IPV6_SERVER : TEXT_ALTERNATE;
-}
-
 bool IsGoodServer(const std::string& text) { return text.empty() || IsValidAddress(text); }
 
 }  // namespace
@@ -71,16 +55,17 @@ DNSConfigurationDialog::DNSConfigurationDialog(Frame* parent, bool dhcpDns, bool
                                                const std::string& hostname)
     : Dialog(parent, DNS_WIDTH, DNS_HEIGHT, DNS_HEADER_HEIGHT),
       _dhcpDns(dhcpDns),
-      _primaryDns(Copy(primary)),
-      _alternateDns(Copy(alternate)),
+      _primaryDns(ParseAddress(AddressText(primary))),
+      _alternateDns(ParseAddress(AddressText(alternate))),
       _hostname(hostname),
       _list(_content->Add<ItemList>(0, 0, _content->Width(), _content->Height())),
       _autoRadio(_strings->GetString(TEXT_AUTO), false),
       _manualRadio(_strings->GetString(TEXT_MANUAL), false),
       _blank("", false),
       _primaryInput(_strings->GetString(TEXT_PRIMARY), AddressText(primary), DNS_FIELD_WIDTH),
-      _alternateInput(_strings->GetString(AlternateLabel(primary, alternate)),
-                      AddressText(alternate), DNS_FIELD_WIDTH),
+      _alternateInput(
+          _strings->GetString(IsMixedPair(primary, alternate) ? TEXT_IPV6_SERVER : TEXT_ALTERNATE),
+          AddressText(alternate), DNS_FIELD_WIDTH),
       _hostnameInput(_strings->GetString(TEXT_HOSTNAME), hostname, DNS_FIELD_WIDTH) {
   _autoRadio.SetEnabled(usingDhcp);
   _manualRadio.SetEnabled(usingDhcp);
