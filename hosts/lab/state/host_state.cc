@@ -59,8 +59,9 @@ class ParsedDocument {
 }  // namespace
 
 std::shared_ptr<const Json> ReadState() {
-  static ParsedDocument document;
-  return document.Current();
+  // Never destroyed: a thread may still ask while the process exits.
+  static auto* const document = new ParsedDocument;
+  return document->Current();
 }
 
 void ChangeState(const std::function<void(Json&)>& change) {
