@@ -125,7 +125,8 @@ void StartAfresh() {
   WriteNames(*state, "");
   const Json files = state->value("files", Json::object());
   for (const auto& [path, entry] : files.items()) {
-    if (path.starts_with("/var/run/")) ApplyFile(entry, path);
+    // What is written anew at each start.
+    if (path.starts_with("/var/run/") || path.starts_with("/etc/host")) ApplyFile(entry, path);
   }
 }
 

@@ -277,6 +277,16 @@ TEST_F(NetworkTest, NameServiceIsLostUnlessSaved) {
   }
 }
 
+TEST_F(NetworkTest, AStartWritesTheHostsOwnNameAnew) {
+  DnsConfigImpl dns(STACK);
+  dns.SetFqdn("rack8.example.org", false, "");
+  dns.SaveConfig();
+  Configure(ToStatic);
+  Lab::StartAfresh();
+  EXPECT_EQ(Lab::ReadFile("/etc/hosts"),
+            "127.0.0.1\tlocalhost\n::1\tlocalhost\n192.0.2.30\track8.example.org rack8\n");
+}
+
 TEST_F(NetworkTest, AGatewayIsStoredUnlessAServerGaveIt) {
   RoutingInfoImpl routing(STACK);
   routing.SetCorelinDefaultGateway(Ipv4Address("192.0.2.9"), true);
