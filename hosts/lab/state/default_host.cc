@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "hostapi/nodeplane/pci_device.h"
 #include "hosts/lab/state/factory_network.h"
 
 namespace Lab {
@@ -59,6 +60,13 @@ std::string OrElse(const std::string& text, const char* fallback) {
   return text.empty() ? fallback : text;
 }
 
+// The functions of one card have to be given away together.
+Json PassthruRecord(const std::string& address) {
+  return {{"name", address},
+          {"state", Nodeplane::Hardware::PassthruDevice::RELEASED},
+          {"group", address.substr(0, address.find('.'))}};
+}
+
 Json PciDevices(const Facts& facts) {
   Json devices = Json::array();
   for (const Machine::PciDevice& device : facts.pciDevices) {
@@ -67,7 +75,9 @@ Json PciDevices(const Facts& facts) {
                        {"class", device.deviceClass},
                        {"vendor", TextNode(device.vendor)},
                        {"device", TextNode(device.device)},
-                       {"driver", device.driver}});
+                       {"driver", device.driver},
+                       {"passthru", true},
+                       {"dependent", PassthruRecord(device.address)}});
   }
   return devices;
 }

@@ -200,11 +200,12 @@ PciInfoImpl& PciInfoImpl::operator=(PciInfoImpl&&) noexcept = default;
 std::vector<std::unique_ptr<PciDevice>> PciInfoImpl::GetAllPciDevices() const {
   using Devices = std::vector<std::unique_ptr<PciDevice>>;
   return Lab::PerformRead<Devices>({"PciInfoImpl::GetAllPciDevices"}, [](const Json& state) {
-    Devices devices;
-    for (const Json& node : Lab::List(state, DEVICES)) devices.push_back(MakeDevice(node));
-    std::sort(devices.begin(), devices.end(), [](const auto& one, const auto& other) {
-      return one->GetAddress() < other->GetAddress();
+    std::vector<Json> nodes = Lab::List(state, DEVICES);
+    std::sort(nodes.begin(), nodes.end(), [](const Json& one, const Json& other) {
+      return Lab::Text(one, "/address") < Lab::Text(other, "/address");
     });
+    Devices devices;
+    for (const Json& node : nodes) devices.push_back(MakeDevice(node));
     return devices;
   });
 }
