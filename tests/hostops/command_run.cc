@@ -1,9 +1,6 @@
 #include "tests/hostops/command_run.h"
 
-#include <syslog.h>
-
 #include <algorithm>
-#include <cerrno>
 #include <chrono>
 
 #include "hostops/command_runner.h"
@@ -35,22 +32,6 @@ CommandResult RunPath(const char* path, std::vector<const char*> argv, int32_t c
 CommandResult RunShell(const char* script, int32_t capacity, int32_t timeoutSeconds,
                        const std::string& input) {
   return RunPath("/bin/sh", {"sh", "-c", script}, capacity, timeoutSeconds, input);
-}
-
-std::vector<std::string> Logged(const Log& log) {
-  // Lines of one process arrive in their order, so behind this one there is nothing to wait for.
-  static int mark = 0;
-  const std::string own = std::string(program_invocation_short_name) + ": ";
-  const std::string last = "end of case " + std::to_string(++mark);
-  syslog(LOG_DEBUG, "%s", last.c_str());
-  log.WaitFor({"user.debug", own + last});
-  std::vector<std::string> lines;
-  for (const LogLine& line : log.Lines()) {
-    if (line.text.rfind(own, 0) == 0 && line.level != "user.debug") {
-      lines.push_back(line.level + " " + line.text.substr(own.size()));
-    }
-  }
-  return lines;
 }
 
 }  // namespace Tarnel::Testing

@@ -24,7 +24,4 @@ CommandResult RunPath(const char* path, std::vector<const char*> argv, int32_t c
 CommandResult RunShell(const char* script, int32_t capacity = 255, int32_t timeoutSeconds = 0,
                        const std::string& input = "");
 
-// All that this process has logged behind the given place, as "level text".
-std::vector<std::string> Logged(const Log& log);
-
 }  // namespace Tarnel::Testing

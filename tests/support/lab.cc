@@ -2,9 +2,11 @@
 
 #include <gtest/gtest.h>
 #include <sys/wait.h>
+#include <syslog.h>
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <cstdio>
 #include <fstream>
 #include <iterator>
@@ -110,6 +112,22 @@ void Log::WaitFor(const LogLine& line) const {
   EXPECT_TRUE(WaitUntil([&] { return Contains(line); }))
       << "No log line \"" << line.level << " " << line.text << "\" behind\n"
       << LastLogLines(15);
+}
+
+std::vector<std::string> Logged(const Log& log) {
+  // Lines of one process arrive in their order, so behind this one there is nothing to wait for.
+  static int mark = 0;
+  const std::string own = std::string(program_invocation_short_name) + ": ";
+  const std::string last = "end of case " + std::to_string(++mark);
+  syslog(LOG_DEBUG, "%s", last.c_str());
+  log.WaitFor({"user.debug", own + last});
+  std::vector<std::string> lines;
+  for (const LogLine& line : log.Lines()) {
+    if (line.text.rfind(own, 0) == 0 && line.level != "user.debug") {
+      lines.push_back(line.level + " " + line.text.substr(own.size()));
+    }
+  }
+  return lines;
 }
 
 std::string LastLogLines(size_t count) {

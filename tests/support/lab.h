@@ -44,6 +44,9 @@ class Log {
   size_t _start;
 };
 
+// All that this process has logged behind the given place, as "level text".
+std::vector<std::string> Logged(const Log& log);
+
 // The end of the host's log, for failures.
 std::string LastLogLines(size_t count);
 
