@@ -99,7 +99,8 @@ class Device : public Base {
   std::string GetName() const override {
     return Lab::PerformRead<std::string>(
         {"PciDevice::GetName", _address}, [this](const Json& state) {
-          return Lab::Text(DeviceNode(state, _address), "/name", _address);
+          return Lab::Text(DeviceNode(state, _address), "/name",
+                           Lab::Text(DeviceNode(state, _address), "/device", _address));
         });
   }
 
