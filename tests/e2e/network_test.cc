@@ -174,6 +174,20 @@ const Lines EVERYTHING = {
     R"(program /bin/stew-cmd stew-cmd -U root internalsvc/refresh)",
 };
 
+constexpr char SWITCH_IPV6[] = R"(NetworkInfoImpl::SetCoreIpv6Enabled "false")";
+constexpr char SAME_ADDRESS[] =
+    R"(NetworkInterface::SetIpConfig core0 "192.0.2.20 255.255.255.0" "ipv6" "dns manual")";
+constexpr char HOSTNAME[] = R"(DnsConfigImpl::SetHostname defaultTcpipStack "rack7" "false")";
+constexpr char DOMAIN[] =
+    R"(DnsConfigImpl::SetSearchDomainsString defaultTcpipStack "example.com")";
+constexpr char IPV6_ON[] = R"(NetworkInfoImpl::SetCoreIpv6Enabled "true")";
+constexpr char LEASES[] = R"(NetworkInterface::SetIpConfig core0 "dhcp" )"
+                          R"("ipv6 dhcp 2001:db8::d:77/128 fe80::fc:ff:fe00:1/64" "dns dhcp")";
+constexpr char STILL_BOUND[] = R"(CoreNic::SetDhcpBound core0 "true")";
+constexpr char SAME_SUFFIX[] = R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "example.com")";
+constexpr char SAVE[] = "DnsConfigImpl::SaveConfig defaultTcpipStack";
+constexpr char REFRESH[] = "program /bin/stew-cmd stew-cmd -U root internalsvc/refresh";
+
 struct Change {
   const char* name;
   const char* scenario;
@@ -195,6 +209,74 @@ TEST(ApplyChanges, WritesWhatIsPendingInItsOrder) {
         "Setting hostname to rack8.example.org", "Setting nameservers to 192.0.2.54 ",
         "Setting suffixes to a.example, b.example", "Network settings changed."},
        EVERYTHING},
+      {"suffixes alone",
+       "sample",
+       "",
+       [](NetworkScreen& screen) {
+         screen.Edit(5, "");
+         screen.Edit(0, "x.example  y,z");
+       },
+       {"Setting adapters to corenic0", "Setting hostname to rack7",
+        "Setting nameservers to 192.0.2.53 ", "Setting suffixes to x.example  y,z",
+        "Network settings changed."},
+       {SWITCH_IPV6, SAME_ADDRESS, HOSTNAME, "DnsConfigImpl::RemoveNameServers defaultTcpipStack",
+        R"(DnsConfigImpl::AddNameServer defaultTcpipStack "192.0.2.53")", DOMAIN,
+        R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "x.example")",
+        R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "y")",
+        R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "z")",
+        "DnsConfigImpl::SaveConfig defaultTcpipStack", REFRESH}},
+      {"a gateway and an unset name server",
+       "sample",
+       "",
+       [](NetworkScreen& screen) {
+         screen.Edit(2, Down(5) + "192.0.2.9");
+         screen.Edit(2, Down(1) + "0.0.0.0");
+       },
+       {"Setting adapters to corenic0", "Setting default gateway to 192.0.2.9",
+        "Setting hostname to rack7", "Setting nameservers to 192.0.2.53 0.0.0.0",
+        "Setting suffixes to example.com", "Network settings changed."},
+       {SWITCH_IPV6, SAME_ADDRESS,
+        R"(RoutingInfoImpl::SetCorelinDefaultGateway defaultTcpipStack "192.0.2.9" "false")",
+        HOSTNAME, "DnsConfigImpl::RemoveNameServers defaultTcpipStack",
+        R"(DnsConfigImpl::AddNameServer defaultTcpipStack "192.0.2.53")", DOMAIN,
+        R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "example.com")",
+        "DnsConfigImpl::SaveConfig defaultTcpipStack", REFRESH}},
+      {"another order and a lease",
+       "network-dhcp",
+       R"({"network": {"switches": {"softSwitch0": {"uplinks": ["corenic0", "corenic1"],
+           "portGroups": {"Management Network":
+             {"teaming": {"mask": 80, "order": ["corenic0", "corenic1"], "max": 2}}}}}}})",
+       [](NetworkScreen& screen) { screen.Edit(0, "  "); },
+       {"Setting adapters to corenic1 corenic0", "Setting ipv6 configuration",
+        "Setting suffixes to example.com", "Network settings changed."},
+       {R"(CoreNicImpl::SetMacFromPnic core0 "corenic1")", IPV6_ON, LEASES, STILL_BOUND, DOMAIN,
+        SAME_SUFFIX, SAVE, REFRESH}},
+      {"no adapter with a lease",
+       "network-dhcp",
+       "",
+       [](NetworkScreen& screen) { screen.Edit(0, " "); },
+       {"Setting adapters to", "Setting ipv6 configuration", "Renew DHCP lease on core0",
+        "Setting suffixes to example.com", "Network settings changed."},
+       {R"(VirtualSwitch::RemoveUplink softSwitch0 "corenic0" "false")",
+        R"(PortGroup::SetTeamingPolicy "Management Network" "mask 80 order max 0")", IPV6_ON,
+        LEASES, STILL_BOUND, "CoreNic::RenewDhcpLease core0", "CoreNic::RenewDhcp6Lease core0",
+        DOMAIN, SAME_SUFFIX, SAVE, REFRESH}},
+      {"from a lease to a static address",
+       "network-dhcp",
+       "",
+       [](NetworkScreen& screen) {
+         screen.Edit(2, Down(2) + " " + Down(1) + "192.0.2.30" + Down(1) + "255.255.255.0" +
+                            Down(1) + "192.0.2.1");
+       },
+       {"Setting adapters to corenic0",
+        "Setting ipv4 configuration to 192.0.2.30 255.255.255.0 on core0",
+        "Setting ipv6 configuration", "Setting default gateway to 192.0.2.1",
+        "Setting suffixes to example.com", "Network settings changed."},
+       {IPV6_ON,
+        R"(NetworkInterface::SetIpConfig core0 "192.0.2.30 255.255.255.0" )"
+        R"("ipv6 dhcp 2001:db8::d:77/128 fe80::fc:ff:fe00:1/64" "dns dhcp")",
+        R"(RoutingInfoImpl::SetCorelinDefaultGateway defaultTcpipStack "192.0.2.1" "false")",
+        DOMAIN, SAME_SUFFIX, SAVE, REFRESH}},
   };
   for (const Change& change : changes) {
     SCOPED_TRACE(change.name);
@@ -288,6 +370,137 @@ TEST(ApplyChanges, GoesOnAfterAStepThatFails) {
     EXPECT_NE(std::find(told.begin(), told.end(), line), told.end()) << line;
     EXPECT_EQ(told.back(), "Network settings changed.");
   }
+}
+
+// An exception that nobody catches: what comes later is not done, and the terminal is given back.
+TEST(ApplyChanges, EndsTheConsoleWhenTheInterfaceDoesNotComeBack) {
+  LoadScenario("sample");
+  NetworkScreen screen;
+  screen.Edit(1, "100");
+  SetState(R"({"faults": [{"operation": "NetworkInterface::Enable", "message": "broken"}]})");
+  const Log log;
+  screen.Apply();
+  EXPECT_EQ(screen.WaitForEnd(), 0);
+  EXPECT_TRUE(screen.ModesAreRestored());
+  EXPECT_TRUE(log.Contains({"user.err", "TARNEL: TARNEL aborted by exception: broken"}));
+  EXPECT_EQ(TraceLines().back(), "NetworkInterface::Enable core0");
+}
+
+TEST(ApplyChanges, AsksBeforeAndRestartsTheHostForIpv6) {
+  LoadScenario("host-stays-up");
+  NetworkScreen screen;
+  screen.Edit(3, Down(1) + " ");
+  EXPECT_EQ(screen.RightPane(4), "IPv6 is enabled.");
+  screen.Press({Keys::ESC});
+  screen.WaitFor("Apply changes and reboot host?");
+  // Back on the screen everything is still pending; no drops it.
+  screen.Press({Keys::ESC});
+  EXPECT_EQ(screen.RightPane(4), "IPv6 is enabled.");
+  screen.Apply();
+  screen.WaitFor("Restart in progress...");
+  screen.WaitUntil([] { return TraceLines().back().starts_with("program /sbin/reboot"); },
+                   "the restart");
+  EXPECT_EQ(GetState("/network/ipv6/nextStart"), "true\n");
+}
+
+TEST(ApplyChanges, LeavesTheHostAloneAfterANo) {
+  LoadScenario("sample");
+  NetworkScreen screen;
+  screen.Edit(1, "100");
+  const size_t start = TraceLines().size();
+  screen.Press({Keys::ESC, "n"});
+  screen.WaitFor("System Customization");
+  EXPECT_EQ(TraceFrom(start), Lines{});
+}
+
+struct Restart {
+  const char* scenario;
+  const char* patch;
+  Lines keys;
+  // What the dialog shows when all is done, or the message.
+  Lines shown;
+};
+
+TEST(RestartNetwork, TellsEachStage) {
+  // The second Enter means nothing.
+  const Lines confirmed = {ENTER, ENTER, Keys::F11};
+  const Restart restarts[] = {
+      {"sample",
+       "",
+       confirmed,
+       {"Stopping management network. Done.", "Starting management network.",
+        "   IP address is  192.0.2.20"}},
+      {"dhcp",
+       "",
+       confirmed,
+       {"Stopping management network. Done.", "Starting management network. Done."}},
+      {"sample",
+       R"({"faults": [{"operation": "NetworkInterface::Enable", "message": "x"}]})",
+       confirmed,
+       {"Operation on the management network interface failed."}},
+      {"sample",
+       R"({"faults": [{"operation": "NetworkInfoImpl::GetManagementInterface", "returns": null}]})",
+       {ENTER},
+       {"Management network interface cannot be found."}},
+  };
+  for (const Restart& restart : restarts) {
+    SCOPED_TRACE(std::string(restart.scenario) + restart.patch);
+    LoadScenario(restart.scenario);
+    Operator terminal;
+    terminal.GoTo("Restart Management Network");
+    if (*restart.patch != '\0') SetState(restart.patch);
+    terminal.Press(restart.keys);
+    for (const std::string& line : restart.shown) terminal.WaitFor(line);
+    terminal.WaitFor("<Enter> OK");
+    terminal.Press({ENTER});
+    terminal.WaitFor("<Enter> Restart");
+  }
+}
+
+struct NetworkTest {
+  const char* name;
+  std::string keys;
+  Lines shown;
+  Lines leave = {Keys::ENTER};
+};
+
+// The sample's gateway and name server, then what is typed over them.
+TEST(TestNetwork, PingsAndResolves) {
+  LoadScenario("ping");
+  const std::string hosts = ReadFile("/etc/hosts");
+  Operator terminal;
+  terminal.GoTo("Test Management Network");
+  const NetworkTest tests[] = {
+      {"a bad address", "1.2.3" + ENTER, {"Invalid IP or IPv6 address."}, {ENTER, Keys::ESC}},
+      {"no step", "\b" + DOWN + "\b" + DOWN + "\b" + DOWN + "\b" + ENTER, {"<Enter> OK"}},
+      {"the host's own",
+       ENTER,
+       {"Pinging address #1 (192.0.2.1).", "Resolving hostname (rack7.example.com).", "OK."}},
+      {"an unreachable one and an unknown name",
+       Down(1) + "203.0.113.9" + Down(2) + "nowhere.example" + ENTER,
+       {"Pinging address #2 (203.0.113.9).", "Failed.", "Resolving hostname (nowhere.example)."}},
+  };
+  for (const NetworkTest& test : tests) {
+    SCOPED_TRACE(test.name);
+    terminal.Press({ENTER, test.keys});
+    for (const std::string& text : test.shown) terminal.WaitFor(text);
+    terminal.WaitFor("<Enter> OK");
+    terminal.Press(test.leave);
+    terminal.WaitFor("<Enter> Run Test");
+    EXPECT_EQ(ReadFile("/etc/hosts"), hosts);
+  }
+}
+
+TEST(TestNetwork, CanBeLeftWhileAStepRuns) {
+  LoadScenario("sample", R"({"ping": {"192.0.2.1": {"delayMs": 60000}}})");
+  Operator terminal;
+  terminal.GoTo("Test Management Network");
+  terminal.Press({ENTER, ENTER});
+  terminal.WaitFor("Pinging address #1 (192.0.2.1).");
+  terminal.Press({ENTER, "x"});
+  terminal.WaitFor("<Esc> Cancel");
+  terminal.Press({Keys::ESC});
+  terminal.WaitFor("<Enter> Run Test");
 }
 
 }  // namespace

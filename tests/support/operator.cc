@@ -17,7 +17,12 @@ Operator::Operator(const Launch& launch) : Terminal(launch) {
 
 void Operator::Press(const std::vector<std::string>& keys) {
   for (const std::string& key : keys) {
+    const size_t before = Output().size();
     Type(key);
+    if (key == Keys::ESC) {
+      // It is held back for a while: what is typed meanwhile would become one key with it.
+      WaitUntil([&] { return Output().size() > before; }, "what Esc does");
+    }
     Settle();
   }
 }
