@@ -124,11 +124,7 @@ void DriverVMDialog::AddRow(const PciDevice& device) {
 int DriverVMDialog::Run() {
   SetTitle(_strings->GetString(TEXT_TITLE));
   SetBody(_strings->GetString(TEXT_BODY));
-  std::vector<Item*> items;
-  for (const auto& item : _items) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_items);
   _list->Repaint();
   SetFooter(HINT_DETAILS);
   for (;;) {
@@ -251,8 +247,7 @@ int DeviceInfoDialog::Run() {
   SetBody("Vendor: " + _vendor + " Device: " + _device);
   _addressText->SetText("PCI Device: " + _address + "\n");
   SetFooter(HINT_OK);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

@@ -87,11 +87,7 @@ void GeneralWindow::AddRows() {
   }
   AddRow(ROW_BLANK, false);
   AddRow(ROW_RESET, !pxe);
-  std::vector<Item*> items;
-  for (const auto& item : _rowItems) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_rowItems);
   for (size_t row = 0; row < _rowIds.size(); ++row) {
     if (_rowIds[row] != ROW_BLANK && !_rowItems[row]->IsSelectable()) {
       DisableRow(_rowIds[row]);

@@ -33,11 +33,7 @@ KeyboardDialog::KeyboardDialog(Frame* parent) : Dialog(parent, WIDTH, HEIGHT, HE
 int KeyboardDialog::Run() {
   SetTitle(_strings->GetString(TEXT_TITLE));
   SetBody(_strings->GetString(TEXT_BODY));
-  std::vector<Item*> items;
-  for (const auto& item : _items) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_items);
   _list->Repaint();
   SetFooter(HINT_SELECT_TOGGLE);
   for (;;) {

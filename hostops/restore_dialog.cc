@@ -20,8 +20,7 @@ int RestoreDialog::Run() {
   if (!IsConfirmed() || !Restore()) {
     return 0;
   }
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   if (RunShell("reboot -f") == -1) {
     return 0;
   }
@@ -37,16 +36,7 @@ bool RestoreDialog::IsConfirmed() {
       "configuration will be lost.");
   _questionText->SetText("Reset System Configuration now?");
   SetFooter(HINT_F11_OK);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case F11_KEY:
-        return true;
-      case ESC_KEY:
-        return false;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(F11_KEY);
 }
 
 // False when the script could not be started; what became of it otherwise is not asked.

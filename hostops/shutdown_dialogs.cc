@@ -109,16 +109,7 @@ int RunningVMsWarningDialog::Run() {
       "Host has VMs running. Are you sure you want to shutdown/restart the host or restore the "
       "network.");
   SetFooter(HINT_CONFIRM);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case ENTER_KEY:
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(ENTER_KEY) ? 1 : 0;
 }
 
 }  // namespace Tarnel

@@ -177,16 +177,7 @@ int SamePasswordConfirmDialog::Run() {
   SetTitle(_strings->GetString(TEXT_WARNING));
   SetBody(_strings->GetString(TEXT_SAME));
   SetFooter(HINT_CONFIRM);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case ENTER_KEY:
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(ENTER_KEY) ? 1 : 0;
 }
 
 }  // namespace Tarnel

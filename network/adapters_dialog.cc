@@ -161,7 +161,7 @@ int AdaptersDialog::HandleKeys() {
         ShowDetails();
         break;
       case ENTER_KEY:
-        if (IsAccepted()) {
+        if (AreAdaptersFree()) {
           return 1;
         }
         break;
@@ -199,7 +199,7 @@ void AdaptersDialog::ShowDetails() {
 }
 
 // One question covers all adapters that are used elsewhere.
-bool AdaptersDialog::IsAccepted() {
+bool AdaptersDialog::AreAdaptersFree() {
   const bool usedElsewhere =
       std::any_of(_selected.begin(), _selected.end(),
                   [this](const std::string& name) { return IsUsedElsewhere(name); });
@@ -238,16 +238,7 @@ int UsedAdaptersDialog::Run() {
   SetBody(_strings->GetString(TEXT_USED_BODY));
   _question->SetText(_strings->GetString(TEXT_USED_QUESTION));
   SetFooter(HINT_OK_CANCEL);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case ENTER_KEY:
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(ENTER_KEY) ? 1 : 0;
 }
 
 AdapterInfoDialog::AdapterInfoDialog(Frame* parent, const std::string& name,
@@ -269,8 +260,7 @@ int AdapterInfoDialog::Run() {
                     "\nConnection Status: " + _status +
                     "\nUsed By: " + (_usedBy.empty() ? "None" : _usedBy));
   SetFooter(HINT_OK);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

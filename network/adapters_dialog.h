@@ -47,7 +47,8 @@ class AdaptersDialog : public Dialog {
   int HandleKeys();
   void ToggleFocused();
   void ShowDetails();
-  bool IsAccepted();
+  // True also when the operator wants them all the same.
+  bool AreAdaptersFree();
   bool IsSelected(const std::string& name) const;
   bool IsUsedElsewhere(const std::string& name);
   // Null when the host has no such adapter.

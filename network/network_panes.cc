@@ -6,6 +6,7 @@
 #include "network/address_text.h"
 #include "network/network_rows.h"
 #include "network/network_window.h"
+#include "widgets/hints.h"
 
 namespace Tarnel {
 
@@ -34,10 +35,6 @@ constexpr int TEXT_NONE = 117;
 constexpr int TEXT_MANUAL = 118;
 constexpr int TEXT_NOT_SET = 120;
 
-constexpr char HINT_SELECT_ROW[] = "{color:black}<Up/Down>{/color} {color:dark-grey}Select{/color}";
-constexpr char HINT_CHANGE_OR_EXIT[] =
-    "{color:white}<Enter>{/color}{color:light-grey} Change{/color}"
-    "{align:right}{color:white}<Esc> {/color}{color:light-grey}Exit{/color}{/align}";
 // Between the values of a pane and what it says about them.
 constexpr char EXPLANATION[] = "{/color}{color:light-grey}";
 

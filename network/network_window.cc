@@ -82,11 +82,7 @@ int NetworkWindow::Run() {
 }
 
 void NetworkWindow::RefreshPanes() {
-  std::vector<Item*> items;
-  for (const auto& item : _menuItems) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_menuItems);
   _list->Repaint();
   ShowRightPane();
 }

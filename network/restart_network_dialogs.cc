@@ -43,17 +43,11 @@ int RestartNetworkDialog::Run() {
   SetBody(_strings->GetString(TEXT_CONFIRM_BODY));
   SetFooter(HINT_F11_OK);
   _text->SetText(_strings->GetString(TEXT_QUESTION));
-  for (;;) {
-    switch (WaitKey(true)) {
-      case F11_KEY:
-        DoRestartNetworkDialog(this, _mgmtNic).Exec();
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
+  if (!IsAccepted(F11_KEY)) {
+    return 0;
   }
+  DoRestartNetworkDialog(this, _mgmtNic).Exec();
+  return 1;
 }
 
 DoRestartNetworkDialog::DoRestartNetworkDialog(Frame* parent, NetworkInterface* nic)
@@ -80,8 +74,7 @@ int DoRestartNetworkDialog::Run() {
   ShowIpv6Addresses(usesDhcp);
   Append(TEXT_DONE, "");
   SetFooter(HINT_OK2);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

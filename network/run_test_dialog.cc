@@ -66,8 +66,7 @@ int RunTestDialog::Run() {
     return 0;
   }
   SetFooter(HINT_OK);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

@@ -73,11 +73,7 @@ void UplinksDialog::AddRows() {
     _checkItems.push_back(item.get());
     _items.push_back(std::move(item));
   }
-  std::vector<Item*> items;
-  for (const auto& item : _items) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_items);
 }
 
 void UplinksDialog::ToggleFocused() {
@@ -104,16 +100,7 @@ int UsedUplinksDialog::Run() {
   SetBody(_strings->GetString(TEXT_NONE_SELECTED));
   _questionText->SetText(_strings->GetString(TEXT_CONTINUE));
   SetFooter(HINT_OK_CANCEL);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case ENTER_KEY:
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(ENTER_KEY) ? 1 : 0;
 }
 
 NoUplinksDialog::NoUplinksDialog(Frame* parent) : Dialog(parent, 60, 10, 5) {}
@@ -122,16 +109,7 @@ int NoUplinksDialog::Run() {
   SetTitle(_strings->GetString(TEXT_NONE_TITLE));
   SetBody(_strings->GetString(TEXT_NONE));
   SetFooter(HINT_OK);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case ENTER_KEY:
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(ENTER_KEY) ? 1 : 0;
 }
 
 }  // namespace Tarnel

@@ -7,6 +7,7 @@
 #include "recovery/restore_network_dialogs.h"
 #include "recovery/safe_mode_network.h"
 #include "shell/key_map.h"
+#include "widgets/hints.h"
 
 namespace Tarnel {
 
@@ -20,17 +21,12 @@ enum Row : int { ROW_SETTINGS = 67, ROW_STANDARD_SWITCH = 68, ROW_LATTICE = 69 }
 // The number of a row's explanation.
 constexpr int ExplanationOf(int row) { return row + 3; }
 
-constexpr char HINT_LEFT[] = "{color:black}<Up/Down>{/color} {color:dark-grey}Select{/color}";
 constexpr char HINT_RESTART[] =
     "{color:white}<Enter>{/color} {color:light-grey}Restart{align:right}"
     "{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
 constexpr char HINT_RESTORE[] =
     "{color:white}<Enter>{/color}{color:light-grey} Restore{/color}{align:right}"
     "{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
-// Stands until the focus moves.
-constexpr char HINT_CHANGE[] =
-    "{color:white}<Enter>{/color}{color:light-grey} Change{/color}{align:right}"
-    "{color:white}<Esc> {/color}{color:light-grey}Exit{/color}{/align}";
 
 }  // namespace
 
@@ -39,11 +35,7 @@ NetworkRestoreWindow::NetworkRestoreWindow(Frame* parent) : RootWindow(parent) {
   AddRow(ROW_SETTINGS, true);
   AddRow(ROW_STANDARD_SWITCH, onLattice);
   AddRow(ROW_LATTICE, onLattice);
-  std::vector<Item*> items;
-  for (const auto& item : _items) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_items);
   if (!onLattice) {
     GreyRow(ROW_STANDARD_SWITCH);
     GreyRow(ROW_LATTICE);
@@ -89,11 +81,12 @@ int NetworkRestoreWindow::Run() {
   }
 }
 
+// The right hint stands until the focus moves.
 void NetworkRestoreWindow::RefreshPanes() {
   _list->Repaint();
   ShowRightPane();
-  SetLeftHint(HINT_LEFT);
-  SetRightHint(HINT_CHANGE);
+  SetLeftHint(HINT_SELECT_ROW);
+  SetRightHint(HINT_CHANGE_OR_EXIT);
 }
 
 void NetworkRestoreWindow::ShowRightPane() {

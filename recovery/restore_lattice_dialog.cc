@@ -88,11 +88,7 @@ void RestoreLatticeDialog::AddRows(const Present& present) {
 int RestoreLatticeDialog::Run() {
   SetTitle(_strings->GetString(TEXT_TITLE));
   SetBody(_strings->GetString(TEXT_BODY));
-  std::vector<Item*> items;
-  for (const auto& item : _items) {
-    items.push_back(item.get());
-  }
-  _list->SetItems(items);
+  _list->SetItems(_items);
   _list->Repaint();
   SetFooter(HINT_F11_OK);
   for (;;) {

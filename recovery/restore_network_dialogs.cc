@@ -56,16 +56,7 @@ bool RestoreNetworkDialog::IsConfirmed() {
   SetBody(_strings->GetString(TEXT_ASK_BODY));
   SetFooter(HINT_F11_RESET);
   _questionText->SetText(_strings->GetString(TEXT_ASK));
-  for (;;) {
-    switch (WaitKey(true)) {
-      case F11_KEY:
-        return true;
-      case ESC_KEY:
-        return false;
-      default:
-        break;
-    }
-  }
+  return IsAccepted(F11_KEY);
 }
 
 DoRestoreNetworkDialog::DoRestoreNetworkDialog(Frame* parent)
@@ -85,8 +76,7 @@ int DoRestoreNetworkDialog::Run() {
   }
   RestoreNetwork(machinesAreOff);
   SetFooter(HINT_OK2);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

@@ -91,20 +91,13 @@ int SafeModeNetworkDialog::Run() {
   SetBody(_strings->GetString(TEXT_BODY));
   _questionText->SetText(_strings->GetString(TEXT_QUESTION));
   SetFooter(HINT_F11_OK);
-  for (;;) {
-    switch (WaitKey(true)) {
-      case F11_KEY:
-        MoveManagementToNewSwitch();
-        syslog(LOG_INFO, "%s",
-               "Enabling safe mode networking by moving all uplinks to a new management "
-               "softSwitch");
-        return 1;
-      case ESC_KEY:
-        return 0;
-      default:
-        break;
-    }
+  if (!IsAccepted(F11_KEY)) {
+    return 0;
   }
+  MoveManagementToNewSwitch();
+  syslog(LOG_INFO, "%s",
+         "Enabling safe mode networking by moving all uplinks to a new management softSwitch");
+  return 1;
 }
 
 // The interfaces go down before anything moves, and the management interface comes up when its

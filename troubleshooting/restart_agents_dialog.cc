@@ -73,8 +73,7 @@ int RestartAgentsDialog::Run() {
   }
   Restart();
   SetFooter(HINT_OK);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

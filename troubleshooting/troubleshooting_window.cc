@@ -9,6 +9,7 @@
 #include "troubleshooting/restart_agents_dialog.h"
 #include "troubleshooting/service_script.h"
 #include "troubleshooting/timeout_dialogs.h"
+#include "widgets/hints.h"
 
 namespace Tarnel {
 
@@ -39,13 +40,9 @@ constexpr int TEXT_SSH_IS_DISABLED = 240;
 constexpr int TEXT_ROW_TITLES[] = {230, 231, TEXT_SHELL_TIMEOUTS, TEXT_TARNEL_TIMEOUT, TEXT_AGENTS};
 constexpr int TEXT_ABOUT_ROWS[] = {235, 236, 242, 243, 241};
 
-constexpr char HINT_SELECT_ROW[] = "{color:black}<Up/Down>{/color} {color:dark-grey}Select{/color}";
 constexpr char HINT_CHANGE[] =
     "{color:white}<Enter>{/color}{color:light-grey} Change{/color}"
     "{align:right}{color:white}<Esc>{/color}{color:light-grey} Exit{/color}{/align}";
-constexpr char HINT_CHANGE2[] =
-    "{color:white}<Enter>{/color}{color:light-grey} Change{/color}"
-    "{align:right}{color:white}<Esc> {/color}{color:light-grey}Exit{/color}{/align}";
 constexpr char HINT_RESTART[] =
     "{color:white}<Enter>{/color}{color:light-grey} Restart{/color}"
     "{align:right}{color:white}<Esc>{/color}{color:light-grey} Exit{/color}{/align}";
@@ -110,13 +107,11 @@ void TroubleShootingWindow::AddRows() {
   const int texts[] = {_shellEnabled ? TEXT_DISABLE_SHELL : TEXT_ENABLE_SHELL,
                        _sshEnabled ? TEXT_DISABLE_SSH : TEXT_ENABLE_SSH, TEXT_SHELL_TIMEOUTS,
                        TEXT_TARNEL_TIMEOUT, TEXT_AGENTS};
-  std::vector<Item*> items;
   for (const int text : texts) {
     _items.push_back(std::make_unique<LabelItem>(Text(text), true));
-    items.push_back(_items.back().get());
   }
   OfferTimeouts(!_shellEnabled && !_sshEnabled);
-  _list->SetItems(items);
+  _list->SetItems(_items);
 }
 
 int TroubleShootingWindow::Run() {
@@ -234,7 +229,7 @@ void TroubleShootingWindow::RefreshPanes() {
   _list->Repaint();
   ShowRightPane();
   SetLeftHint(HINT_SELECT_ROW);
-  SetRightHint(HINT_CHANGE2);
+  SetRightHint(HINT_CHANGE_OR_EXIT);
 }
 
 void TroubleShootingWindow::ShowRightPane() {

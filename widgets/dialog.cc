@@ -1,6 +1,7 @@
 #include "widgets/dialog.h"
 
 #include "shell/colours.h"
+#include "shell/key_map.h"
 
 namespace Tarnel {
 
@@ -27,6 +28,20 @@ void Dialog::SetTitle(const std::string& title) { _titleText->SetText(title); }
 void Dialog::SetBody(const std::string& body) { _bodyText->SetText(body); }
 
 void Dialog::SetFooter(const std::string& hint) { _hintText->SetText(hint); }
+
+bool Dialog::IsAccepted(int acceptKey) {
+  for (;;) {
+    const int key = WaitKey(true);
+    if (key == acceptKey || key == ESC_KEY) {
+      return key == acceptKey;
+    }
+  }
+}
+
+void Dialog::WaitForEnter() {
+  while (WaitKey(true) != ENTER_KEY) {
+  }
+}
 
 // What another dialog has covered of the dimmed parent comes back below this one.
 void Dialog::Activate(bool active) {

@@ -23,6 +23,11 @@ class Dialog : public Frame {
   void Activate(bool active) override;
 
  protected:
+  // Waits for the key that accepts, which gives true, or for Esc.
+  bool IsAccepted(int acceptKey);
+  // Waits until the operator has seen enough.
+  void WaitForEnter();
+
   Window* _header;
   Window* _footer;
   // Null where the lower band has no room for it.

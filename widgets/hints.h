@@ -2,6 +2,13 @@
 
 namespace Tarnel {
 
+// The key hints at the bottom of the two panes of a screen.
+inline constexpr char HINT_SELECT_ROW[] =
+    "{color:black}<Up/Down>{/color} {color:dark-grey}Select{/color}";
+inline constexpr char HINT_CHANGE_OR_EXIT[] =
+    "{color:white}<Enter>{/color}{color:light-grey} Change{/color}"
+    "{align:right}{color:white}<Esc> {/color}{color:light-grey}Exit{/color}{/align}";
+
 // The key hints at the bottom of dialogs.
 inline constexpr char HINT_OK[] =
     "{align:right}{color:black}<Enter>{/color} {color:dark-grey}OK{/color}{/align}";

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -17,6 +18,15 @@ class ItemList : public Window {
 
   // Takes a copy of the pointers and puts the focus on the first usable item. Does not draw.
   void SetItems(const std::vector<Item*>& items);
+  // The same for items that their owner keeps in a vector.
+  template <class OwnedItem>
+  void SetItems(const std::vector<std::unique_ptr<OwnedItem>>& items) {
+    std::vector<Item*> pointers;
+    for (const auto& item : items) {
+      pointers.push_back(item.get());
+    }
+    SetItems(pointers);
+  }
   // Puts the focus on the n-th selectable item, enabled or not. Serves lists whose top is 0. Does
   // not draw.
   void SelectItem(int n);

@@ -23,8 +23,7 @@ int MessageDialog::Run() {
   SetTitle(_strings->GetString(_titleId));
   SetBody(_body);
   SetFooter(HINT_OK);
-  while (WaitKey(true) != ENTER_KEY) {
-  }
+  WaitForEnter();
   return 1;
 }
 

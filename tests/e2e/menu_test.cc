@@ -7,50 +7,14 @@
 
 #include "shell/colours.h"
 #include "tests/support/lab.h"
-#include "tests/support/terminal.h"
+#include "tests/support/operator.h"
 
 namespace Tarnel::Testing {
 
 namespace {
 
-constexpr char DOWN[] = "\x1b[B";
-constexpr char UP[] = "\x1b[A";
-constexpr char ENTER[] = "\r";
 constexpr char PAGE_UP[] = "\x1b[5~";
 constexpr char PAGE_DOWN[] = "\x1b[6~";
-
-// The console with an operator who is logged in.
-class Operator : public Terminal {
- public:
-  explicit Operator(const Launch& launch = {}) : Terminal(launch) {
-    WaitFor("<F2> Customize");
-    Press(Keys::F2);
-    WaitFor("<Esc> Cancel");
-    Press("root\tlaboratory\r");
-    WaitFor("System Customization");
-    Settle();
-  }
-
-  void Press(const std::string& key, int times = 1) {
-    for (int i = 0; i < times; ++i) {
-      const size_t before = Output().size();
-      Type(key);
-      // Only after a moment the console knows that no sequence follows.
-      WaitUntil([&] { return key != Keys::ESC || Output().size() != before; }, "Esc");
-      Settle();
-    }
-  }
-  // Goes to the row whose pane has this title.
-  void GoTo(const std::string& title) {
-    for (int row = 0; row < 12 && RightPane(1) != title; ++row) Press(DOWN);
-    EXPECT_EQ(RightPane(1), title);
-  }
-  std::string RightPane(int y) const {
-    std::string row = Row(y).substr(41, 38);
-    row.erase(row.find_last_not_of(' ') + 1);
-    return row.substr(std::min(row.find_first_not_of(' '), row.size()));
-  }
-};
 
 struct MenuRow {
   const char* title;
@@ -88,7 +52,7 @@ TEST(Menu, TellsAboutTheFocusedRow) {
     EXPECT_EQ(terminal.RightPane(1), row.title);
     EXPECT_EQ(terminal.RightPane(4), row.text);
     EXPECT_EQ(terminal.RightPane(22), row.hint);
-    terminal.Press(DOWN);
+    terminal.Press({Keys::DOWN});
   }
 }
 
@@ -173,7 +137,7 @@ TEST(SupportPages, AreLeafed) {
   };
   for (const auto& [key, shown] : keys) {
     SCOPED_TRACE(shown);
-    if (*key != '\0') terminal.Press(key);
+    if (*key != '\0') terminal.Press({key});
     EXPECT_EQ(terminal.Row(4).substr(42, 35),
               "<Page Up>       " + std::string(shown, 3) + "     <Page Down>");
     const std::string first = terminal.Row(5).substr(42, 36);
@@ -181,8 +145,8 @@ TEST(SupportPages, AreLeafed) {
                   .substr(0, strlen(shown)),
               shown);
   }
-  terminal.Press(UP);
-  terminal.Press(DOWN);
+  terminal.Press({Keys::UP});
+  terminal.Press({Keys::DOWN});
   EXPECT_NE(terminal.Row(4).find("1/3"), std::string::npos);
 }
 
@@ -213,12 +177,12 @@ TEST(LogViewer, HandsTheTerminalToThePager) {
   LoadScenario("logs");
   Operator terminal({.term = "xterm-256color"});
   const std::string password = terminal.Picture();
-  terminal.Press("6");
+  terminal.Press({"6"});
   EXPECT_EQ(terminal.Picture(), password);
   terminal.GoTo("View System Logs");
   const std::string menu = terminal.Picture();
   const termios modes = terminal.Modes();
-  for (const char* const ignored : {"0", "7", "8", "9"}) terminal.Press(ignored);
+  for (const char* const ignored : {"0", "7", "8", "9"}) terminal.Press({ignored});
   EXPECT_EQ(terminal.Picture(), menu);
   terminal.Type("6");
   terminal.WaitFor("<Q> Quit </> RegExp Search <H> Help");
@@ -239,7 +203,7 @@ TEST(LogViewer, HandsTheTerminalToThePager) {
   EXPECT_EQ(after.c_iflag, modes.c_iflag);
   EXPECT_EQ(after.c_oflag, modes.c_oflag);
   EXPECT_EQ(after.c_lflag, modes.c_lflag);
-  terminal.Press(DOWN);
+  terminal.Press({Keys::DOWN});
   EXPECT_EQ(terminal.RightPane(1), "View Support Information");
 }
 
@@ -248,7 +212,7 @@ TEST(LogViewer, ComesBackWhenThePagerCannotStart) {
   Operator terminal;
   terminal.GoTo("View System Logs");
   const std::string menu = terminal.Picture();
-  terminal.Press("1");
+  terminal.Press({"1"});
   terminal.WaitForPicture(menu);
   EXPECT_FALSE(terminal.HasEnded());
 }
@@ -295,11 +259,11 @@ void ExpectDialogCase(const char* title, const DialogCase& dialog) {
   Operator terminal;
   terminal.GoTo(title);
   const Log log;
-  terminal.Type(ENTER);
+  terminal.Type(Keys::ENTER);
   terminal.WaitFor("Toggle Selected");
   terminal.Settle();
   for (const char* key = dialog.keys; *key != '\0'; ++key) {
-    terminal.Press(*key == 'v' ? DOWN : std::string(1, *key));
+    terminal.Press({*key == 'v' ? Keys::DOWN : std::string(1, *key)});
   }
   terminal.WaitUntil([&] { return terminal.At(42, 4).fg == WHITE; }, "the menu");
   terminal.WaitUntil(
@@ -346,8 +310,8 @@ TEST(Keyboard, EndsTheConsoleWhenTheHostFails) {
   Operator terminal;
   terminal.GoTo("Configure Keyboard");
   const Log log;
-  terminal.Press(ENTER);
-  terminal.Type(ENTER);
+  terminal.Press({Keys::ENTER});
+  terminal.Type(Keys::ENTER);
   terminal.WaitForEnd();
   log.WaitFor({"user.err", "TARNEL: TARNEL aborted by exception: The layout cannot be stored."});
 }
@@ -361,7 +325,7 @@ TEST(Timeout, LogsOutOfEveryDepth) {
         {.environment = {"LD_PRELOAD=/usr/lib/x86_64-linux-gnu/faketime/libfaketime.so.1",
                          "FAKETIME=+0 x200", "ASAN_OPTIONS=verify_asan_link_order=0"}});
     const Log log;
-    for (const char* key = keys; *key != '\0'; ++key) terminal.Press(std::string(1, *key));
+    for (const char* key = keys; *key != '\0'; ++key) terminal.Press({std::string(1, *key)});
     terminal.WaitUntil([&] { return terminal.Colours(1) == "0/6*80"; }, "the dimmed screen");
     terminal.WaitFor("<F2> Customize");
     terminal.WaitUntil([&] { return terminal.At(1, 1).bg == DARK_GREY; }, "the colours");
@@ -376,12 +340,12 @@ TEST(Timeout, LogsOutOfEveryDepth) {
 TEST(RestartRequest, WaitsForTheLogOut) {
   LoadScenario("static");
   Operator terminal;
-  terminal.Press(ENTER);
+  terminal.Press({Keys::ENTER});
   const std::string form = terminal.Picture();
   terminal.Signal(SIGUSR2);
   terminal.Settle();
   EXPECT_EQ(terminal.Picture(), form);
-  terminal.Press(Keys::ESC);
+  terminal.Press({Keys::ESC});
   EXPECT_FALSE(terminal.HasEnded());
   terminal.Type(Keys::ESC);
   EXPECT_EQ(terminal.WaitForEnd(), 0);
@@ -390,7 +354,7 @@ TEST(RestartRequest, WaitsForTheLogOut) {
 TEST(EndSignal, EndsTheConsoleInADialog) {
   LoadScenario("static");
   Operator terminal;
-  terminal.Press(ENTER);
+  terminal.Press({Keys::ENTER});
   EXPECT_TRUE(terminal.CursorVisible());
   terminal.Signal(SIGTERM);
   EXPECT_EQ(terminal.WaitForEnd(), 0);

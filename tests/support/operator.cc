@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <chrono>
 
 namespace Tarnel::Testing {
 
@@ -21,10 +22,17 @@ void Operator::Press(const std::vector<std::string>& keys) {
     Type(key);
     if (key == Keys::ESC) {
       // It is held back for a while: what is typed meanwhile would become one key with it.
-      WaitUntil([&] { return Output().size() > before; }, "what Esc does");
+      constexpr std::chrono::milliseconds HELD_BACK(150);
+      const auto end = std::chrono::steady_clock::now() + HELD_BACK;
+      WaitUntil([&] { return Output().size() > before || std::chrono::steady_clock::now() > end; },
+                "what Esc does");
     }
     Settle();
   }
+}
+
+void Operator::PressTimes(const std::string& key, int times) {
+  Press(std::vector<std::string>(static_cast<size_t>(times), key));
 }
 
 void Operator::GoTo(const std::string& title) {

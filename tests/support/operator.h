@@ -22,6 +22,7 @@ class Operator : public Terminal {
   // Types each and waits until the screen has settled: a frame that opens drops what was typed
   // ahead of it.
   void Press(const std::vector<std::string>& keys);
+  void PressTimes(const std::string& key, int times);
   // Goes down to the row whose pane has this title.
   void GoTo(const std::string& title);
   // A row of the right pane without the blanks around it.
