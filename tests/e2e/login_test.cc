@@ -128,7 +128,9 @@ TEST(Login, IsRefusedWithItsReason) {
       {"login-denied", "root", "wrong", false},  {"login-denied", "root", PASSWORD, true},
       {"notary-absent", "root", "wrong", false},
   };
+  const Log start;
   Terminal terminal;
+  start.WaitFor({"user.info", "TARNEL: Starting TARNEL"});
   for (const auto& [scenario, user, password, denied] : attempts) {
     SCOPED_TRACE(std::string(scenario) + " " + user);
     LoadScenario(scenario);
