@@ -171,6 +171,7 @@ std::vector<std::string> ThereAndBack(const char* there, const char* back, size_
 
 constexpr size_t MENU_MOVES = 10;
 
+constexpr size_t NETWORK_ROW = 2;
 constexpr size_t KEYBOARD_ROW = 6;
 
 void MeasureKeys() {
@@ -183,6 +184,64 @@ void MeasureKeys() {
   session.CloseForm();
   session.OpenRow(KEYBOARD_ROW);
   PrintTimes("keyboard form, Down and Up", TimesOf(session, ThereAndBack(DOWN, UP, 9), COUNT));
+}
+
+// The screen of the management network: opening it, typing into its forms, writing a change.
+void MeasureNetwork() {
+  constexpr size_t COUNT = 300;
+  constexpr size_t VISITS = 40;
+  printf("the management network\n");
+  Session session;
+  for (size_t row = 0; row < NETWORK_ROW; ++row) session.TimeOf(DOWN);
+  std::vector<KeyTime> openings;
+  std::vector<KeyTime> applications;
+  for (size_t visit = 0; visit < VISITS; ++visit) {
+    openings.push_back(session.TimeOf(ENTER));
+    for (const std::string key : {DOWN, ENTER, visit % 2 == 0 ? "7" : "8", ENTER, "\x1b"}) {
+      session.TimeOf(key);
+    }
+    session.Expect("<Y> Yes");
+    applications.push_back(session.TimeOf("y"));
+    session.Settle();
+  }
+  PrintTimes("opening", openings);
+  PrintTimes("a VLAN, with all its steps", applications);
+  for (const std::string key : {ENTER, DOWN, ENTER}) session.TimeOf(key);
+  PrintTimes("VLAN form, typing", TimesOf(session, ThereAndBack("1", BACKSPACE, 4), COUNT));
+  for (const std::string key : {"\x1b", DOWN, DOWN, ENTER}) session.TimeOf(key);
+  PrintTimes("IPv6 form, Down and Up", TimesOf(session, {DOWN, UP}, COUNT));
+}
+
+// From the end that coreping logs to the screen.
+void MeasureTestSteps() {
+  constexpr size_t VISITS = 20;
+  Session session;
+  for (size_t row = 0; row <= NETWORK_ROW + 1; ++row) session.TimeOf(DOWN);
+  std::vector<double> delays;
+  for (size_t visit = 0; visit < VISITS; ++visit) {
+    const Log log;
+    session.TimeOf(ENTER);
+    for (const std::string key : {DOWN, BACKSPACE, DOWN, DOWN, BACKSPACE}) session.TimeOf(key);
+    session.Type(ENTER);
+    session.WaitFor("OK.");
+    const double shown = double(std::chrono::duration_cast<std::chrono::microseconds>(
+                                    std::chrono::system_clock::now().time_since_epoch())
+                                    .count()) /
+                         1e3;
+    session.Expect("<Enter> OK");
+    for (const LogLine& line : log.Lines()) {
+      const size_t at = line.text.rfind(" at ");
+      if (line.text.find("coreping") != std::string::npos && at != std::string::npos) {
+        delays.push_back(shown - std::stod(line.text.substr(at + 4)) * 1e3);
+      }
+    }
+    session.Type(ENTER);
+    session.Settle();
+  }
+  std::sort(delays.begin(), delays.end());
+  if (delays.empty()) throw std::runtime_error("coreping logs no end");
+  printf("  the result of a test step    passed     %7.3f ms median %7.3f ms at most (n=%zu)\n",
+         delays[delays.size() / 2], delays.back(), delays.size());
 }
 
 chtype LineCharacter(const std::string& shape) {
@@ -285,6 +344,8 @@ int main(int argc, char** argv) {
   try {
     LoadScenario("static");
     MeasureKeys();
+    MeasureNetwork();
+    MeasureTestSteps();
     MeasureBytes();
     MeasureMemory(argc > 1 ? atoi(argv[1]) : 100000);
   } catch (const std::exception& error) {

@@ -202,8 +202,9 @@ void NetworkWindow::SwitchIpv6(ApplyFlags& flags) {
   LogProgress("Setting ipv6 configuration");
   _workingConfig.SetUseIpv6Dhcp(_modeConfig.GetUseIpv6Dhcp());
   _workingConfig.SetUseIpv6RouterAdvertised(_modeConfig.GetUseIpv6RouterAdvertised());
-  flags.renewDhcp6 = flags.renewDhcp6 && _modeConfig.IsUsingIpv6Dhcp() &&
-                     _mgmtNic->GetIpConfig().IsUsingIpv6Dhcp();
+  const bool staysInUse =
+      _modeConfig.IsUsingIpv6Dhcp() && _mgmtNic->GetIpConfig().IsUsingIpv6Dhcp();
+  flags.renewDhcp6 = flags.renewDhcp6 && staysInUse;
 }
 
 // Without any DHCP there is nobody who could tell the name servers.
@@ -234,7 +235,8 @@ void NetworkWindow::WriteIpv4Gateway(const ApplyFlags& flags) {
   }
   try {
     const Ipv4Address& gateway = _workingConfig.GetIpv4Gateway();
-    if (flags.ipv4Rewritten || !(_routingInfo.GetCorelinDefaultGateway() == gateway)) {
+    const bool isInEffect = _routingInfo.GetCorelinDefaultGateway() == gateway;
+    if (!isInEffect || flags.ipv4Rewritten) {
       LogProgress("Setting default gateway to " + gateway.GetStringAddress());
       _routingInfo.SetCorelinDefaultGateway(gateway, false);
     }

@@ -197,7 +197,7 @@ struct Change {
   Lines trace;
 };
 
-TEST(ApplyChanges, WritesWhatIsPendingInItsOrder) {
+TEST(ApplyChanges, WriteWhatIsPendingInItsOrder) {
   const Change changes[] = {
       {"everything",
        "sample",
@@ -300,8 +300,9 @@ struct FailingStep {
   std::string told;
   // Beginnings of the lines of EVERYTHING that are missing, as the step's failure has it.
   Lines missing;
-  // A line that comes before the restart of the interface.
+  // A line that comes in addition, and before which one.
   const char* added = nullptr;
+  const char* before = "NetworkInterface::Disable";
 };
 
 bool IsAmong(const Lines& beginnings, const std::string& line) {
@@ -309,7 +310,7 @@ bool IsAmong(const Lines& beginnings, const std::string& line) {
                      [&](const std::string& beginning) { return line.starts_with(beginning); });
 }
 
-TEST(ApplyChanges, GoesOnAfterAStepThatFails) {
+TEST(ApplyChanges, GoOnAfterAStepThatFails) {
   const Lines restart = {"NetworkInterface::Disable", "NetworkInterface::Refresh",
                          "NetworkInterface::Enable"};
   const Lines afterFqdn = {"DnsConfigImpl::RemoveNameServers", "DnsConfigImpl::AddNameServer",
@@ -320,6 +321,30 @@ TEST(ApplyChanges, GoesOnAfterAStepThatFails) {
   Lines vlanAndRestart = restart;
   vlanAndRestart.emplace_back("PortGroup::SetVlan");
   const FailingStep steps[] = {
+      {"PortGroup::GetTeamingPolicy",
+       "",
+       "Getting uplinks failed: a=broken;",
+       {"VirtualSwitch::RemoveUplink", "VirtualSwitch::AddUplink", "PortGroup::SetTeaming"},
+       R"(CoreNicImpl::SetMacFromPnic core0 "corenic0")",
+       "PortGroup::SetVlan"},
+      {"NetworkInterface::GetRunningIpConfig",
+       "Setting ip configuration failed: broken",
+       "",
+       {"RoutingInfoImpl::SetCorelin"},
+       "CoreNic::RenewDhcpLease core0"},
+      {"CoreNic::IsDhcpBound",
+       "Setting ip/ipv6 configuration failed: broken",
+       "",
+       {"NetworkInterface::SetIpConfig"}},
+      {"RoutingInfoImpl::GetCorelinDefaultGateway",
+       "Setting default gateway failed: a=broken;",
+       "",
+       {"RoutingInfoImpl::SetCorelin"}},
+      {"DnsConfigImpl::AddNameServer", "Setting DNS failed: broken", "", afterDomain},
+      {"DnsConfigImpl::AddSearchDomain",
+       "Setting DNS failed: broken",
+       "",
+       {R"(DnsConfigImpl::AddSearchDomain defaultTcpipStack "b)", "DnsConfigImpl::SaveConfig"}},
       {"VirtualSwitch::AddUplink",
        "",
        "Adding uplink corenic1 failed: a=broken;",
@@ -360,9 +385,10 @@ TEST(ApplyChanges, GoesOnAfterAStepThatFails) {
     Lines expected = EVERYTHING;
     std::erase_if(expected, [&](const std::string& line) { return IsAmong(step.missing, line); });
     if (step.added != nullptr) {
-      expected.insert(
-          std::find(expected.begin(), expected.end(), "NetworkInterface::Disable core0"),
-          step.added);
+      const auto place =
+          std::find_if(expected.begin(), expected.end(),
+                       [&](const std::string& line) { return line.starts_with(step.before); });
+      expected.insert(place, step.added);
     }
     EXPECT_EQ(TraceFrom(start), expected);
     const Lines told = Told(log);
@@ -372,21 +398,60 @@ TEST(ApplyChanges, GoesOnAfterAStepThatFails) {
   }
 }
 
-// An exception that nobody catches: what comes later is not done, and the terminal is given back.
-TEST(ApplyChanges, EndsTheConsoleWhenTheInterfaceDoesNotComeBack) {
-  LoadScenario("sample");
-  NetworkScreen screen;
-  screen.Edit(1, "100");
-  SetState(R"({"faults": [{"operation": "NetworkInterface::Enable", "message": "broken"}]})");
-  const Log log;
-  screen.Apply();
-  EXPECT_EQ(screen.WaitForEnd(), 0);
-  EXPECT_TRUE(screen.ModesAreRestored());
-  EXPECT_TRUE(log.Contains({"user.err", "TARNEL: TARNEL aborted by exception: broken"}));
-  EXPECT_EQ(TraceLines().back(), "NetworkInterface::Enable core0");
+struct UncaughtFailure {
+  const char* scenario;
+  void (*edit)(NetworkScreen& screen);
+  const char* operation;
+};
+
+// What comes later is not done, and the terminal is given back.
+TEST(ApplyChanges, EndTheConsoleWhenTheInterfaceDoesNotComeBack) {
+  const auto changeVlan = [](NetworkScreen& screen) { screen.Edit(1, "100"); };
+  const UncaughtFailure failures[] = {
+      {"network-dhcp", [](NetworkScreen& screen) { screen.Edit(0, " "); },
+       "CoreNic::RenewDhcpLease"},
+      {"sample", changeVlan, "NetworkInterface::Disable"},
+      {"sample", changeVlan, "NetworkInterface::Refresh"},
+      {"sample", changeVlan, "NetworkInterface::Enable"},
+  };
+  for (const auto& [scenario, edit, operation] : failures) {
+    SCOPED_TRACE(operation);
+    LoadScenario(scenario);
+    NetworkScreen screen;
+    edit(screen);
+    SetState(R"({"faults": [{"operation": ")" + std::string(operation) +
+             R"(", "message": "broken"}]})");
+    const Log log;
+    screen.Apply();
+    EXPECT_EQ(screen.WaitForEnd(), 0);
+    EXPECT_TRUE(screen.ModesAreRestored());
+    log.WaitFor({"user.err", "TARNEL: TARNEL aborted by exception: broken"});
+    EXPECT_EQ(TraceLines().back(), std::string(operation) + " core0");
+  }
 }
 
-TEST(ApplyChanges, AsksBeforeAndRestartsTheHostForIpv6) {
+TEST(ApplyChanges, TellWhenTheMacAddressCannotBeTaken) {
+  LoadScenario("sample", R"({"network": {"switches": {"softSwitch0": {"portGroups":
+      {"Management Network": {"teaming": {"order": ["corenic1", "corenic0"]}}}}}},
+      "faults": [{"operation": "CoreNicImpl::SetMacFromPnic", "message": "a=broken;"}]})");
+  NetworkScreen screen;
+  screen.Edit(0, DOWN + "  ");
+  screen.Apply({"Setting mac address of upnic failed: broken"});
+  screen.WaitFor("System Customization");
+  EXPECT_EQ(TraceLines().back(), REFRESH);
+}
+
+TEST(ApplyChanges, ShowOnTheWelcomeScreen) {
+  LoadScenario("sample");
+  NetworkScreen screen;
+  screen.Edit(2, Down(3) + "192.0.2.30");
+  screen.Apply();
+  screen.WaitFor("System Customization");
+  screen.Press({Keys::ESC});
+  screen.WaitFor("http://192.0.2.30/ (STATIC)");
+}
+
+TEST(ApplyChanges, AskBeforeAndRestartTheHostForIpv6) {
   LoadScenario("host-stays-up");
   NetworkScreen screen;
   screen.Edit(3, Down(1) + " ");
@@ -403,7 +468,7 @@ TEST(ApplyChanges, AsksBeforeAndRestartsTheHostForIpv6) {
   EXPECT_EQ(GetState("/network/ipv6/nextStart"), "true\n");
 }
 
-TEST(ApplyChanges, LeavesTheHostAloneAfterANo) {
+TEST(ApplyChanges, LeaveTheHostAloneAfterANo) {
   LoadScenario("sample");
   NetworkScreen screen;
   screen.Edit(1, "100");
