@@ -22,6 +22,7 @@ class ItemList : public Window {
   template <class OwnedItem>
   void SetItems(const std::vector<std::unique_ptr<OwnedItem>>& items) {
     std::vector<Item*> pointers;
+    pointers.reserve(items.size());
     for (const auto& item : items) {
       pointers.push_back(item.get());
     }
