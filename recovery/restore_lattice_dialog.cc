@@ -78,7 +78,6 @@ void RestoreLatticeDialog::AddRows(const Present& present) {
   auto vlan = std::make_unique<InputItem>(_strings->GetString(TEXT_VLAN),
                                           std::to_string(present.vlanId), VLAN_FIELD_WIDTH);
   _unblockItem = unblock.get();
-  _uplinksItem = uplinks.get();
   _vlanItem = vlan.get();
   _items.push_back(std::move(unblock));
   _items.push_back(std::move(uplinks));

@@ -48,7 +48,6 @@ class RestoreLatticeDialog : public Dialog {
   std::vector<std::unique_ptr<Item>> _items;
   std::vector<std::string> _selectedUplinks;
   CheckItem* _unblockItem = nullptr;
-  LabelItem* _uplinksItem = nullptr;
   InputItem* _vlanItem = nullptr;
   bool _unblock = false;
 };
