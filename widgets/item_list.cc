@@ -113,8 +113,9 @@ void ItemList::DrawRows() {
   }
 }
 
+// A list without room for a row has none that is drawn.
 void ItemList::DrawFocusedItem() {
-  if (_focusRow < Rows() && FocusIndex() < Count()) {
+  if (_focusRow >= 0 && _focusRow < Rows() && FocusIndex() < Count()) {
     At(FocusIndex())->Draw(TextOf(_focusRow));
   }
 }
