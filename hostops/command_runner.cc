@@ -3,6 +3,7 @@
 #include <fcntl.h>
 #include <poll.h>
 #include <sys/ioctl.h>
+#include <sys/signalfd.h>
 #include <sys/syscall.h>
 #include <sys/wait.h>
 #include <syslog.h>
@@ -130,28 +131,44 @@ class Feed {
   size_t _left;
 };
 
+// Readable when a child has ended or stopped, while SIGCHLD is blocked.
+int WatchChildren() {
+  sigset_t childSignal;
+  sigemptyset(&childSignal);
+  sigaddset(&childSignal, SIGCHLD);
+  return signalfd(-1, &childSignal, SFD_NONBLOCK | SFD_CLOEXEC);
+}
+
 // A child from its start until its wait status has been taken.
 class Child {
  public:
   explicit Child(pid_t pid)
-      : _pid(pid), _endDescriptor(static_cast<int>(syscall(SYS_pidfd_open, pid, 0))) {}
+      : _pid(pid),
+        _endDescriptor(static_cast<int>(syscall(SYS_pidfd_open, pid, 0))),
+        _changeDescriptor(WatchChildren()) {}
   ~Child() {
-    if (_endDescriptor != -1) {
-      close(_endDescriptor);
+    for (const int fd : {_endDescriptor, _changeDescriptor}) {
+      if (fd != -1) {
+        close(fd);
+      }
     }
   }
   Child(const Child&) = delete;
   Child& operator=(const Child&) = delete;
 
   // Serves the streams until the child has ended, and gives its wait status; -1 when it was killed
-  // at the limit or cannot be waited for.
+  // at the limit or cannot be waited for. A child that stops, as by the terminal's suspend
+  // character, is killed too: nobody would let it go on.
   int Wait(int32_t timeoutSeconds, Feed& in, Capture& out, Capture& err) {
     const auto limit = milliseconds(timeoutSeconds * INT64_C(1000));
     const auto start = steady_clock::now();
     int64_t left = timeoutSeconds > 0 ? limit.count() : -1;
     while (left != 0) {
       int status = -1;
-      if (Serve(left, in, out, err) && waitpid(_pid, &status, WNOHANG) != 0) {
+      if (Serve(left, in, out, err) && waitpid(_pid, &status, WNOHANG | WUNTRACED) != 0) {
+        if (WIFSTOPPED(status)) {
+          Kill();
+        }
         return status;
       }
       if (timeoutSeconds > 0) {
@@ -166,12 +183,13 @@ class Child {
 
  private:
   // Waits for the next event, but not longer than the given time (-1: for ever). True when the
-  // child may have ended.
+  // child may have ended or stopped.
   bool Serve(int64_t limit, Feed& in, Capture& out, Capture& err) {
     pollfd watched[] = {{_endDescriptor, POLLIN, 0},
                         {in.Descriptor(), POLLOUT, 0},
                         {out.Descriptor(), POLLIN, 0},
-                        {err.Descriptor(), POLLIN, 0}};
+                        {err.Descriptor(), POLLIN, 0},
+                        {_changeDescriptor, POLLIN, 0}};
     int wait = static_cast<int>(std::min<int64_t>(limit, INT_MAX));
     if (_endDescriptor == -1) {
       wait = wait < 0 ? FALLBACK_POLL_MS : std::min(wait, FALLBACK_POLL_MS);
@@ -186,8 +204,12 @@ class Child {
       if (watched[3].revents != 0) {
         err.ReadSome();
       }
+      if (watched[4].revents != 0) {
+        signalfd_siginfo change;
+        static_cast<void>(read(_changeDescriptor, &change, sizeof change));
+      }
     }
-    return _endDescriptor == -1 || watched[0].revents != 0;
+    return _endDescriptor == -1 || watched[0].revents != 0 || watched[4].revents != 0;
   }
 
   void Kill() const {
@@ -204,6 +226,7 @@ class Child {
   pid_t _pid;
   // Readable once the child has ended; -1 where the kernel has no such descriptors.
   int _endDescriptor;
+  int _changeDescriptor;
 };
 
 // Gives the child's process id, or -1 with errno set.
