@@ -19,20 +19,19 @@ constexpr char PING_PATH[] = "/sbin/coreping";
 constexpr char HOSTS[] = "/etc/hosts";
 constexpr char HOSTS_BACKUP[] = "/etc/hosts.backup";
 
-// A child of the console begins like any other program: nothing blocked, nothing ignored.
-pid_t ForkWithDefaultSignals() {
+pid_t Fork() {
   UpdateScreen();
-  const pid_t pid = fork();
-  if (pid != 0) {
-    return pid;
-  }
+  return fork();
+}
+
+// A program begins with nothing blocked and nothing ignored.
+void ResetSignals() {
   for (int number = 1; number < NSIG; ++number) {
     signal(number, SIG_DFL);
   }
   sigset_t none;
   sigemptyset(&none);
   sigprocmask(SIG_SETMASK, &none, nullptr);
-  return 0;
 }
 
 bool BackUpHosts() {
@@ -87,10 +86,11 @@ pid_t StartPing(const std::string& address, const std::string& interface) {
   const char* const argv[] = {"coreping", address.c_str(), interface.empty() ? nullptr : "-I",
                               interface.c_str(), nullptr};
   const char* const environment[] = {nullptr};
-  const pid_t pid = ForkWithDefaultSignals();
+  const pid_t pid = Fork();
   if (pid != 0) {
     return pid;
   }
+  ResetSignals();
   for (const int fd : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
     close(fd);
   }
@@ -99,7 +99,9 @@ pid_t StartPing(const std::string& address, const std::string& interface) {
 }
 
 pid_t StartResolve(const std::string& hostname) {
-  const pid_t pid = ForkWithDefaultSignals();
+  // The signals that end the console stay blocked: a child that they ended would leave the file as
+  // it is while the name is looked up.
+  const pid_t pid = Fork();
   if (pid != 0) {
     return pid;
   }
