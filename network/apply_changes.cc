@@ -14,6 +14,7 @@
 #include "network/apply_changes_dialog.h"
 #include "network/network_window.h"
 #include "network/switch_operations.h"
+#include "shell/screen.h"
 #include "widgets/message_dialog.h"
 
 namespace Tarnel {
@@ -222,6 +223,7 @@ void NetworkWindow::WriteIpConfiguration(const ApplyFlags& flags) {
   if (flags.ipv4Rewritten) {
     ShowRightPane();
     RedrawLines();
+    UpdateScreen();
   }
   if (wasBound && _workingConfig.GetUseDhcp()) {
     coreNic->SetDhcpBound(true);

@@ -33,7 +33,7 @@ constexpr int TEXT_TITLE = 46;
 std::string Join(const std::vector<std::string>& words) {
   std::string text;
   for (const std::string& word : words) {
-    text += (text.empty() ? "" : ", ") + word;
+    text += (&word == &words.front() ? "" : ", ") + word;
   }
   return text;
 }
