@@ -9,6 +9,7 @@
 #include "hostapi/nodeplane/exception.h"
 #include "hostops/command_runner.h"
 #include "login/login_dialog.h"
+#include "widgets/hints.h"
 
 namespace Tarnel {
 
@@ -39,7 +40,8 @@ constexpr int TEXT_NOT_SET = 120;
 constexpr int TEXT_ENABLED = 121;
 constexpr int TEXT_DISABLED = 122;
 
-constexpr char HINT_SELECT_ROW[] = "{color:black}<Up/Down>{/color}{color:dark-grey} Select{/color}";
+constexpr char HINT_SELECT_MENU_ROW[] =
+    "{color:black}<Up/Down>{/color}{color:dark-grey} Select{/color}";
 constexpr char HINT_CHANGE[] =
     "{color:white}<Enter>{/color}{color:light-grey} Change{/color}"
     "{align:right}{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
@@ -48,9 +50,6 @@ constexpr char HINT_CHANGE2[] =
     "{align:right}{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
 constexpr char HINT_MORE[] =
     "{color:white}<Enter>{/color}{color:light-grey} More{/color}"
-    "{align:right}{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
-constexpr char HINT_RESTART[] =
-    "{color:white}<Enter>{/color} {color:light-grey}Restart"
     "{align:right}{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
 constexpr char HINT_RUN_TEST[] =
     "{color:white}<Enter>{/color}{color:light-grey} Run Test{/color}"
@@ -71,9 +70,9 @@ constexpr RowHint ROW_HINTS[] = {
     {ROW_LOCKDOWN, HINT_CHANGE2},
     {ROW_DRIVER_VM, ""},
     {ROW_NETWORK, HINT_MORE},
-    {ROW_RESTART_NETWORK, HINT_RESTART},
+    {ROW_RESTART_NETWORK, HINT_RESTART_OR_LOG_OUT},
     {ROW_TEST_NETWORK, HINT_RUN_TEST},
-    {ROW_RESTORE_NETWORK, HINT_RESTART},
+    {ROW_RESTORE_NETWORK, HINT_RESTART_OR_LOG_OUT},
     {ROW_SUPPORT, HINT_LOG_OUT},
     {ROW_LOGS, HINT_LOG_OUT},
     {ROW_TROUBLESHOOTING, HINT_MORE},
@@ -96,7 +95,7 @@ std::string White(const std::string& text) { return "{color:white}" + text + "{/
 
 void GeneralWindow::RefreshPanes() {
   SetLeftTitle(Text(TEXT_TITLE));
-  SetLeftHint(HINT_SELECT_ROW);
+  SetLeftHint(HINT_SELECT_MENU_ROW);
   _list->Repaint();
   ShowRightPane();
 }
@@ -106,6 +105,8 @@ void GeneralWindow::ShowRightPane() {
   if (row != ROW_DRIVER_VM) {
     SetRightTitle(Text(row));
   }
+  // Empty while the password is checked.
+  _rightText->SetText("");
   _rightText->SetText(RightText(row));
   SetRightHint(HintOf(row));
   if (!_hasPassword) {
@@ -195,11 +196,11 @@ std::string GeneralWindow::ConfiguredAddressText() const {
 }
 
 std::string GeneralWindow::Ipv6Text() const {
-  if (!Coreplane::Network::NetworkInfoImpl().IsCoreIpv6Enabled()) {
-    return "";
-  }
   std::string text = Text(TEXT_IPV6_ADDRESSES) + ":\n";
   try {
+    if (!Coreplane::Network::NetworkInfoImpl().IsCoreIpv6Enabled()) {
+      return "";
+    }
     if (const auto nic = LookupManagementInterface(); nic != nullptr) {
       text += Ipv6Lines(nic->GetRunningIpConfig().GetIpv6Network());
     }

@@ -9,7 +9,6 @@ namespace Tarnel {
 namespace {
 
 constexpr int TEXT_PRODUCT = 2;
-constexpr char NETWORK_STACK[] = "defaultTcpipStack";
 
 }  // namespace
 
@@ -17,8 +16,8 @@ constexpr char NETWORK_STACK[] = "defaultTcpipStack";
 // stay on top of both.
 RootWindow::RootWindow(Frame* parent)
     : Frame(parent, 0, 0, COLS, LINES, BLACK, WHITE),
-      _dnsConfig(NETWORK_STACK),
-      _routingInfo(NETWORK_STACK) {
+      _dnsConfig(Coreplane::Network::DEFAULT_STACK),
+      _routingInfo(Coreplane::Network::DEFAULT_STACK) {
   const int half = COLS / 2;
   const int height = LINES - 1;
   _frameArea = CreateChild(0, 0, COLS, height, LIGHT_GREY, WHITE);

@@ -40,6 +40,9 @@ int32_t ReadFully(int fd, char* buffer, int32_t size);
 int32_t RunStewCmd(const char* path, const char** argv, char* outBuf, int32_t* outLen, char* errBuf,
                    int32_t* errLen, const char* inBuf, uint32_t inLen);
 
+// RunStewCmd for a command of the management agent on behalf of the operator, whatever it prints.
+int32_t RunStewCmdAsOperator(const char* command);
+
 // Asks the management agent a question; false also when there is no answer within 120 seconds.
 bool QueryStewBool(const std::string& command);
 

@@ -19,11 +19,6 @@ struct FreeText {
   void operator()(char* text) const { free(text); }
 };
 
-void RunStewCmdAsOperator(const char* command) {
-  const char* argv[] = {"stew-cmd", "-U", Frame::LoginName().c_str(), command, nullptr};
-  RunStewCmd(STEW_CMD_PATH, argv, nullptr, nullptr, nullptr, nullptr, nullptr, 0);
-}
-
 }  // namespace
 
 const std::string TARNEL_USER = "tarnel";
@@ -44,6 +39,11 @@ int32_t RunStewCmd(const char* path, const char** argv, char* outBuf, int32_t* o
     *errLen = 256;
   }
   return RunCommand(path, argv, outBuf, outLen, errBuf, errLen, inBuf, inLen, 0);
+}
+
+int32_t RunStewCmdAsOperator(const char* command) {
+  const char* argv[] = {"stew-cmd", "-U", Frame::LoginName().c_str(), command, nullptr};
+  return RunStewCmd(STEW_CMD_PATH, argv, nullptr, nullptr, nullptr, nullptr, nullptr, 0);
 }
 
 bool QueryStewBool(const std::string& command) {

@@ -18,7 +18,6 @@ constexpr int WIDTH = 60;
 constexpr int HEIGHT = 14;
 constexpr int HEADER_HEIGHT = 6;
 constexpr int FIELD_WIDTH = 30;
-constexpr int TAB_KEY = '\t';
 
 // What SelectionIndex() gives for each field.
 constexpr int OLD_FIELD = 0;

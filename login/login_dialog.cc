@@ -5,7 +5,6 @@
 #include <unistd.h>
 
 #include "customization/keyboard_dialog.h"
-#include "hostapi/coreplane/ip_services.h"
 #include "hostops/command_runner.h"
 #include "hostops/event_reporting.h"
 #include "shell/key_map.h"
@@ -20,7 +19,6 @@ constexpr int WIDTH = 60;
 constexpr int HEIGHT = 13;
 constexpr int HEADER_HEIGHT = 6;
 constexpr int FIELD_WIDTH = 30;
-constexpr int TAB_KEY = '\t';
 
 constexpr int TEXT_TITLE = 144;
 constexpr int TEXT_ENTER_PASSWORD = 145;
@@ -77,8 +75,7 @@ void LoginDialog::ShowKeyboardNote() {
 
 // What was typed in the other mode is gone.
 void LoginDialog::ShowMode(bool pin) {
-  const Coreplane::Network::DnsConfigImpl dns("defaultTcpipStack");
-  const std::string host = dns.GetHostname() + "." + dns.GetDomain() + ".";
+  const std::string host = TextArea::GetHostnameValue() + ".";
   SetFooter(pin ? HINT_PIN_MODE : HINT_OK_CANCEL);
   _loginItem.SetLabel(_strings->GetString(pin ? TEXT_LOGIN_ID : TEXT_LOGIN_NAME));
   _loginItem.SetValue(pin ? _smartCardLoginId : DEFAULT_USER);

@@ -1,6 +1,5 @@
 #include "login/login_disabled_dialog.h"
 
-#include "hostapi/coreplane/ip_services.h"
 #include "shell/key_map.h"
 #include "widgets/hints.h"
 
@@ -21,9 +20,8 @@ LoginDisabledDialog::LoginDisabledDialog(Frame* parent)
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT) {}
 
 int LoginDisabledDialog::Run() {
-  const Coreplane::Network::DnsConfigImpl dns("defaultTcpipStack");
   SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY) + dns.GetHostname() + "." + dns.GetDomain() + ".");
+  SetBody(_strings->GetString(TEXT_BODY) + TextArea::GetHostnameValue() + ".");
   SetFooter(HINT_OK);
   int key = 0;
   while (key != ENTER_KEY && key != ESC_KEY) {

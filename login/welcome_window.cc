@@ -31,7 +31,8 @@ bool adapterAlertSent = false;
 }  // namespace
 
 WelcomeWindow::WelcomeWindow()
-    : Frame(nullptr, 0, 0, COLS, LINES, BLACK, WHITE), _dnsConfig("defaultTcpipStack") {}
+    : Frame(nullptr, 0, 0, COLS, LINES, BLACK, WHITE),
+      _dnsConfig(Coreplane::Network::DEFAULT_STACK) {}
 
 int WelcomeWindow::Run() {
   Draw();
@@ -217,11 +218,14 @@ void WelcomeWindow::ShowAddresses(const std::string& addresses) {
 void WelcomeWindow::ShowMachine() {
   _productText->SetText(_strings->GetString(TEXT_PRODUCT));
   const Coreplane::Hardware::HardwareInfoImpl hardware;
-  _hostText->SetText(MachineName(hardware.GetVendorName(), hardware.GetProductName()));
+  const std::string vendor = hardware.GetVendorName();
+  _hostText->SetText(MachineName(vendor, hardware.GetProductName()));
   const Coreplane::Hardware::CpuInfoImpl cpu;
+  const auto packages = cpu.GetNumCpuPackages();
+  const std::string cpuLine = CpuLine(packages, cpu.GetModelName());
   const Coreplane::Hardware::MemoryInfoImpl memory;
-  _hardwareText->SetText(CpuLine(cpu.GetNumCpuPackages(), cpu.GetModelName()) + "\n" +
-                         MemoryLine(memory.GetTotalPages() * memory.GetPageSize()));
+  const auto pages = memory.GetTotalPages();
+  _hardwareText->SetText(cpuLine + "\n" + MemoryLine(pages * memory.GetPageSize()));
 }
 
 }  // namespace Tarnel

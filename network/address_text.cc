@@ -5,6 +5,7 @@ namespace Tarnel {
 using Nodeplane::Network::IpAddress;
 using Nodeplane::Network::Ipv4Address;
 using Nodeplane::Network::Ipv6Address;
+using Nodeplane::Network::Ipv6Network;
 
 std::string AddressText(const IpAddress* address) {
   return address != nullptr ? address->GetStringAddress() : "";
@@ -32,6 +33,11 @@ std::unique_ptr<IpAddress> ParseAddress(const std::string& text) {
 
 bool IsValidAddress(const std::string& text) {
   return Ipv4Address::IsValidAddress(text) || Ipv6Address::IsValidAddress(text);
+}
+
+bool IsStaticGlobal(const Ipv6Network& network) {
+  return network.GetIpv6AddressType() == Ipv6Network::STATIC &&
+         network.GetIpv6Scope() != Ipv6Network::LINK_LOCAL;
 }
 
 }  // namespace Tarnel

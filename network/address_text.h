@@ -19,5 +19,7 @@ bool IsMixedPair(const Nodeplane::Network::IpAddress* first,
 std::unique_ptr<Nodeplane::Network::IpAddress> ParseAddress(const std::string& text);
 // The text is an address of either family.
 bool IsValidAddress(const std::string& text);
+// Set by hand, and good beyond its own link.
+bool IsStaticGlobal(const Nodeplane::Network::Ipv6Network& network);
 
 }  // namespace Tarnel

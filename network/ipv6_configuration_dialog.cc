@@ -3,8 +3,9 @@
 #include <cctype>
 #include <vector>
 
-#include "network/form_fields.h"
+#include "network/address_text.h"
 #include "shell/key_map.h"
+#include "widgets/form_fields.h"
 #include "widgets/hints.h"
 
 namespace Tarnel {
@@ -52,11 +53,6 @@ std::string AddressLabel(StringFactory& strings, int number) {
   return std::string(strings.GetString(TEXT_ADDRESS)) + " #" + std::to_string(number);
 }
 
-bool IsEditable(const Ipv6Network& network) {
-  return network.GetIpv6AddressType() == Ipv6Network::STATIC &&
-         network.GetIpv6Scope() != Ipv6Network::LINK_LOCAL;
-}
-
 // With the scope, which an untouched form would lose otherwise.
 std::string GatewayText(const IpConfig& config) {
   const std::string text = config.GetIpv6Gateway().GetScopedStringAddress();
@@ -90,7 +86,7 @@ void IPv6ConfigurationDialog::TakeAddresses() {
   int shown = 0;
   const std::vector<Ipv6Network> networks = _config.GetIpv6Network();
   for (const Ipv6Network& network : networks) {
-    if (shown < ADDRESSES && IsEditable(network)) {
+    if (shown < ADDRESSES && IsStaticGlobal(network)) {
       _addressInputs[shown++].SetValue(network.GetStringAddress());
       _config.RemoveIpv6Network(network);
     }

@@ -3,6 +3,7 @@
 #include <syslog.h>
 
 #include "hostops/event_reporting.h"
+#include "network/address_text.h"
 #include "shell/colours.h"
 #include "shell/key_map.h"
 #include "widgets/hints.h"
@@ -25,11 +26,6 @@ constexpr int TEXT_STARTING = 136;
 constexpr int TEXT_ADDRESS = 137;
 
 constexpr char INDENT[] = "   ";
-
-bool IsWorthShowing(const Ipv6Network& network) {
-  return network.GetIpv6AddressType() == Ipv6Network::STATIC &&
-         network.GetIpv6Scope() != Ipv6Network::LINK_LOCAL;
-}
 
 }  // namespace
 
@@ -102,7 +98,7 @@ void DoRestartNetworkDialog::ShowIpv6Addresses(bool usesDhcp) {
       lines += std::string(INDENT) + "...\n";
       break;
     }
-    if (IsWorthShowing(network)) {
+    if (IsStaticGlobal(network)) {
       lines += INDENT + std::string(_strings->GetString(TEXT_ADDRESS)) + " " +
                network.GetStringAddress() + "\n";
       ++shown;

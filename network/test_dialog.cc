@@ -4,9 +4,9 @@
 
 #include "hostapi/coreplane/network_info.h"
 #include "network/address_text.h"
-#include "network/form_fields.h"
 #include "network/run_test_dialog.h"
 #include "shell/key_map.h"
+#include "widgets/form_fields.h"
 #include "widgets/hints.h"
 
 namespace Tarnel {
@@ -20,13 +20,14 @@ constexpr int TEXT_BODY = 216;
 constexpr int TEXT_PING_ADDRESS = 217;
 constexpr int TEXT_RESOLVE_HOSTNAME = 218;
 
-constexpr char NETWORK_STACK[] = "defaultTcpipStack";
 constexpr int FIELD_WIDTH = 30;
 
 }  // namespace
 
 TestDialog::TestDialog(Frame* parent)
-    : Dialog(parent, 70, 14, 6), _dnsConfig(NETWORK_STACK), _routingInfo(NETWORK_STACK) {
+    : Dialog(parent, 70, 14, 6),
+      _dnsConfig(Coreplane::Network::DEFAULT_STACK),
+      _routingInfo(Coreplane::Network::DEFAULT_STACK) {
   std::vector<std::string> candidates = Candidates();
   std::erase_if(candidates, [](const std::string& text) { return !IsSetAddress(text); });
   candidates.resize(_addressInputs.size());

@@ -3,8 +3,8 @@
 #include <cctype>
 #include <cstdlib>
 
-#include "network/form_fields.h"
 #include "shell/key_map.h"
+#include "widgets/form_fields.h"
 #include "widgets/hints.h"
 #include "widgets/message_dialog.h"
 

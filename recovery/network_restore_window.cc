@@ -21,9 +21,6 @@ enum Row : int { ROW_SETTINGS = 67, ROW_STANDARD_SWITCH = 68, ROW_LATTICE = 69 }
 // The number of a row's explanation.
 constexpr int ExplanationOf(int row) { return row + 3; }
 
-constexpr char HINT_RESTART[] =
-    "{color:white}<Enter>{/color} {color:light-grey}Restart{align:right}"
-    "{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
 constexpr char HINT_RESTORE[] =
     "{color:white}<Enter>{/color}{color:light-grey} Restore{/color}{align:right}"
     "{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
@@ -94,7 +91,7 @@ void NetworkRestoreWindow::ShowRightPane() {
   _rightText->SetText("");
   SetRightTitle(_strings->GetString(row));
   _rightText->SetText(_strings->GetString(ExplanationOf(row)));
-  SetRightHint(row == ROW_SETTINGS ? HINT_RESTART : HINT_RESTORE);
+  SetRightHint(row == ROW_SETTINGS ? HINT_RESTART_OR_LOG_OUT : HINT_RESTORE);
 }
 
 void NetworkRestoreWindow::OpenRow() {

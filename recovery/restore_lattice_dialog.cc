@@ -2,10 +2,13 @@
 
 #include <syslog.h>
 
+#include <cctype>
+
 #include "hostapi/nodeplane/exception.h"
 #include "hostops/command_runner.h"
 #include "recovery/lattice_uplink_dialogs.h"
 #include "shell/key_map.h"
+#include "widgets/form_fields.h"
 #include "widgets/hints.h"
 #include "widgets/message_dialog.h"
 
@@ -123,7 +126,7 @@ void RestoreLatticeDialog::HandleKey(int key) {
     _unblockItem->SetChecked(_unblock);
   } else if (key == ENTER_KEY && field == FIELD_UPLINKS) {
     ChooseUplinks();
-  } else if (field == FIELD_VLAN && ((key >= '0' && key <= '9') || IsEditingKey(key))) {
+  } else if (field == FIELD_VLAN && IsFieldKey(key, isdigit, "")) {
     _vlanItem->HandleKey(key);
   }
 }

@@ -4,6 +4,7 @@ namespace Tarnel {
 
 // Key codes as WaitKey() gives them; all others are characters or curses' own KEY_ values.
 enum Key : int {
+  TAB_KEY = 9,
   ENTER_KEY = 10,
   ESC_KEY = 27,
   SPACE_KEY = 32,

@@ -9,4 +9,6 @@ int32_t RunServiceScript(const char* script, const char* action) {
   return RunCommand("/bin/sh", argv, nullptr, nullptr, nullptr, nullptr, nullptr, 0, 0);
 }
 
+bool IsServiceRunning(const char* script) { return RunServiceScript(script, "status") == 0; }
+
 }  // namespace Tarnel

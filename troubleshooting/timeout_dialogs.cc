@@ -2,6 +2,7 @@
 
 #include <syslog.h>
 
+#include <cctype>
 #include <cstdlib>
 #include <optional>
 #include <string>
@@ -9,6 +10,7 @@
 #include "hostops/command_runner.h"
 #include "shell/key_map.h"
 #include "troubleshooting/service_script.h"
+#include "widgets/form_fields.h"
 #include "widgets/hints.h"
 #include "widgets/message_dialog.h"
 
@@ -58,21 +60,20 @@ void WriteMinutes(const char* option, int32_t minutes) {
 }
 
 void RestartIfRunning(const char* script) {
-  if (RunServiceScript(script, "status") == 0) {
+  if (IsServiceRunning(script)) {
     RunServiceScript(script, "restart");
   }
 }
 
-bool IsFieldKey(int key) { return (key >= '0' && key <= '9') || IsEditingKey(key); }
-
 // The minutes that the operator wants; none when the field is empty or, which is told of, when they
-// are out of range. A number too large for strtol() is out of range too.
-std::optional<int32_t> MinutesIn(const InputItem& item, Frame* form) {
+// are out of range. A number too large for strtol() is out of range too; negative ones are only
+// borne where they are stored already.
+std::optional<int32_t> MinutesIn(const InputItem& item, int32_t stored, Frame* form) {
   if (item.Value().empty()) {
     return std::nullopt;
   }
   const long minutes = strtol(item.Value().c_str(), nullptr, 10);
-  if (minutes < 0 || minutes > MAX_MINUTES) {
+  if (minutes > MAX_MINUTES || (minutes < 0 && minutes != stored)) {
     MessageDialog(form, TEXT_INVALID_TITLE, TEXT_INVALID).Exec();
     return std::nullopt;
   }
@@ -130,7 +131,7 @@ bool ShellTimeoutDialog::IsConfirmed() {
         _list->MoveDown();
         break;
       default:
-        if (IsFieldKey(key)) {
+        if (IsFieldKey(key, isdigit, "")) {
           FocusedItem().HandleKey(key);
           _list->Repaint();
         }
@@ -144,7 +145,7 @@ InputItem& ShellTimeoutDialog::FocusedItem() {
 
 // A service that runs reads its availability only when it starts.
 void ShellTimeoutDialog::ApplyAvailability() {
-  const std::optional<int32_t> minutes = MinutesIn(_availabilityItem, this);
+  const std::optional<int32_t> minutes = MinutesIn(_availabilityItem, _availabilityMinutes, this);
   if (!minutes || *minutes == _availabilityMinutes) {
     return;
   }
@@ -155,7 +156,7 @@ void ShellTimeoutDialog::ApplyAvailability() {
 }
 
 void ShellTimeoutDialog::ApplyIdle() {
-  const std::optional<int32_t> minutes = MinutesIn(_idleItem, this);
+  const std::optional<int32_t> minutes = MinutesIn(_idleItem, _idleMinutes, this);
   if (!minutes || *minutes == _idleMinutes) {
     return;
   }
@@ -192,7 +193,7 @@ bool TarnelTimeoutDialog::IsConfirmed() {
     if (key == ENTER_KEY || key == ESC_KEY) {
       return key == ENTER_KEY;
     }
-    if (IsFieldKey(key)) {
+    if (IsFieldKey(key, isdigit, "")) {
       _timeoutItem.HandleKey(key);
       _list->Repaint();
     }
@@ -201,7 +202,8 @@ bool TarnelTimeoutDialog::IsConfirmed() {
 
 // Compared in seconds: a stored value that is no whole number of minutes is rounded down to one.
 void TarnelTimeoutDialog::Apply() {
-  const std::optional<int32_t> minutes = MinutesIn(_timeoutItem, this);
+  const std::optional<int32_t> minutes =
+      MinutesIn(_timeoutItem, _oldSeconds / SECONDS_PER_MINUTE, this);
   if (!minutes || *minutes * SECONDS_PER_MINUTE == _oldSeconds) {
     return;
   }

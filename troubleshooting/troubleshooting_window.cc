@@ -47,13 +47,6 @@ constexpr char HINT_RESTART[] =
     "{color:white}<Enter>{/color}{color:light-grey} Restart{/color}"
     "{align:right}{color:white}<Esc>{/color}{color:light-grey} Exit{/color}{/align}";
 
-int32_t TellAgent(const char* command) {
-  const char* argv[] = {"stew-cmd", "-U", Frame::LoginName().c_str(), command, nullptr};
-  return RunStewCmd("/bin/stew-cmd", argv, nullptr, nullptr, nullptr, nullptr, nullptr, 0);
-}
-
-bool IsRunning(const char* script) { return RunServiceScript(script, "status") == 0; }
-
 }  // namespace
 
 struct TroubleShootingWindow::Service {
@@ -98,8 +91,8 @@ const TroubleShootingWindow::Service TroubleShootingWindow::SSH = {
 
 TroubleShootingWindow::TroubleShootingWindow(Frame* parent)
     : RootWindow(parent),
-      _shellEnabled(IsRunning(SHELL_SCRIPT)),
-      _sshEnabled(IsRunning(SSH_SCRIPT)) {
+      _shellEnabled(IsServiceRunning(SHELL_SCRIPT)),
+      _sshEnabled(IsServiceRunning(SSH_SCRIPT)) {
   AddRows();
 }
 
@@ -184,7 +177,7 @@ void TroubleShootingWindow::Toggle(const Service& service, bool& enabled) {
 
 // Where the agent fails, the service's own script serves, which knows nothing of the firewall.
 void TroubleShootingWindow::StartOrStop(const Service& service, bool enabled) {
-  if (TellAgent(enabled ? service.stopCommand : service.startCommand) == 0) {
+  if (RunStewCmdAsOperator(enabled ? service.stopCommand : service.startCommand) == 0) {
     return;
   }
   syslog(LOG_WARNING, "Unable to run stew-cmd to start/stop %s", service.nameInFailures);
@@ -212,7 +205,7 @@ void TroubleShootingWindow::SwitchFirewall(bool enabled) {
 }
 
 void TroubleShootingWindow::KeepForNextStart(const Service& service, bool enabled) {
-  if (TellAgent(enabled ? service.disableCommand : service.enableCommand) != 0) {
+  if (RunStewCmdAsOperator(enabled ? service.disableCommand : service.enableCommand) != 0) {
     syslog(LOG_WARNING, "Unable to run stew-cmd to enable/disable %s", service.nameInFailures);
   }
 }

@@ -2,12 +2,17 @@
 
 namespace Tarnel {
 
+// Where two hints differ only in whether a blank stands inside a tag, both are meant.
+
 // The key hints at the bottom of the two panes of a screen.
 inline constexpr char HINT_SELECT_ROW[] =
     "{color:black}<Up/Down>{/color} {color:dark-grey}Select{/color}";
 inline constexpr char HINT_CHANGE_OR_EXIT[] =
     "{color:white}<Enter>{/color}{color:light-grey} Change{/color}"
     "{align:right}{color:white}<Esc> {/color}{color:light-grey}Exit{/color}{/align}";
+inline constexpr char HINT_RESTART_OR_LOG_OUT[] =
+    "{color:white}<Enter>{/color} {color:light-grey}Restart"
+    "{align:right}{color:white}<Esc>{/color}{color:light-grey} Log Out{/color}{/align}";
 
 // The key hints at the bottom of dialogs.
 inline constexpr char HINT_OK[] =

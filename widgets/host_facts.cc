@@ -61,7 +61,7 @@ std::string KeyFingerprint(const char* keyFile) {
 }
 
 SystemVersionRecord ReadVersionRecord() {
-  SystemVersionRecord record;
+  SystemVersionRecord record{};
   Coreplane::Util::SysinfoUtil::SysinfoGet(SYSNODE_NODE_system_version, &record, sizeof record,
                                            nullptr);
   return record;
@@ -75,8 +75,10 @@ std::string FieldText(const char (&field)[SIZE]) {
 std::string StorageDriverVersion(Nodeplane::Host& host) {
   try {
     for (const auto& adapter : host.GetStorageService().GetAdapters()) {
-      if (adapter->GetName() != STORAGE_ADAPTER) continue;
-      return host.GetDriverService().FindDriver(adapter->GetDriverName())->GetVersion();
+      if (adapter == nullptr || adapter->GetName() != STORAGE_ADAPTER) continue;
+      const auto driver = host.GetDriverService().FindDriver(adapter->GetDriverName());
+      if (driver == nullptr) throw NodeplaneException("The host has no such driver");
+      return driver->GetVersion();
     }
   } catch (const NodeplaneException& error) {
     syslog(LOG_ERR, "Get %s version string failed, err=%s", STORAGE_ADAPTER, error.what());
@@ -174,8 +176,9 @@ std::string TextArea::GetSerialNumberValue() {
 }
 
 std::string TextArea::GetHostnameValue() {
-  const Coreplane::Network::DnsConfigImpl dns("defaultTcpipStack");
-  return dns.GetHostname() + "." + dns.GetDomain();
+  const Coreplane::Network::DnsConfigImpl dns(Coreplane::Network::DEFAULT_STACK);
+  const std::string hostname = dns.GetHostname();
+  return hostname + "." + dns.GetDomain();
 }
 
 std::string TextArea::GetOstrelProduct() {
@@ -201,7 +204,8 @@ std::string TextArea::GetSupportPeriod() { return NOT_AVAILABLE; }
 
 std::string TextArea::GetSystemMemory() {
   const Coreplane::Hardware::MemoryInfoImpl memory;
-  return FormatMemorySize(memory.GetTotalPages() * memory.GetPageSize());
+  const auto pages = memory.GetTotalPages();
+  return FormatMemorySize(pages * memory.GetPageSize());
 }
 
 std::string TextArea::GetServiceTag() {

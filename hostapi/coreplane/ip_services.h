@@ -8,7 +8,10 @@
 
 namespace Coreplane::Network {
 
-// The name service settings of one TCP/IP stack, such as "defaultTcpipStack". Changes act at once
+// The TCP/IP stack of the management network.
+inline constexpr char DEFAULT_STACK[] = "defaultTcpipStack";
+
+// The name service settings of one TCP/IP stack. Changes act at once
 // and are lost at the next start of the host unless they are saved. Every operation throws
 // NodeplaneException when the host fails.
 class DnsConfigImpl {

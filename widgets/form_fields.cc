@@ -1,4 +1,4 @@
-#include "network/form_fields.h"
+#include "widgets/form_fields.h"
 
 #include "widgets/message_dialog.h"
 

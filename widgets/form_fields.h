@@ -6,7 +6,7 @@
 #include "widgets/input_item.h"
 #include "widgets/item_list.h"
 
-// What the forms of the management network have in common.
+// What forms have in common.
 namespace Tarnel {
 
 // An editing key, or a character of the kind (isdigit and its like) or among the others.
