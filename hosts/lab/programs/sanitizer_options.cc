@@ -1,6 +1,10 @@
 // Standard error is /dev/null in the console and programs lose their environment, so the sanitizers
 // write their reports where the tests look for them.
 
+#if defined(__SANITIZE_ADDRESS__)
+#include <dlfcn.h>
+#endif
+
 // The names are the sanitizers' own.
 // NOLINTBEGIN(bugprone-reserved-identifier)
 extern "C" {
@@ -18,3 +22,19 @@ const char* __ubsan_default_options() {
 
 }  // extern "C"
 // NOLINTEND(bugprone-reserved-identifier)
+
+#if defined(__SANITIZE_ADDRESS__)
+namespace {
+
+// Beside the other sanitizer, that of undefined behaviour sets the path in the other's library
+// instead of its own.
+[[gnu::constructor]] void SetReportPath() {
+  void* const library = dlopen("libubsan.so.1", RTLD_LAZY | RTLD_NOLOAD);
+  void* const set = library != nullptr ? dlsym(library, "__sanitizer_set_report_path") : nullptr;
+  if (set != nullptr) {
+    reinterpret_cast<void (*)(const char*)>(set)("/var/log/sanitizer");
+  }
+}
+
+}  // namespace
+#endif
