@@ -23,14 +23,11 @@
 namespace {
 
 using namespace Tarnel::Testing;
+using namespace Tarnel::Testing::Keys;
 using std::chrono::steady_clock;
 
 constexpr int COLUMNS = 80;
 constexpr int ROWS = 25;
-constexpr char DOWN[] = "\x1b[B";
-constexpr char UP[] = "\x1b[A";
-constexpr char ENTER[] = "\r";
-constexpr char BACKSPACE[] = "\x7f";
 
 std::string StatusLine(pid_t pid, const std::string& name) {
   std::ifstream status("/proc/" + std::to_string(pid) + "/status");
@@ -60,7 +57,7 @@ class Session : public Terminal {
  public:
   Session() {
     Expect("<F2> Customize");
-    Type(Keys::F2);
+    Type(F2);
     Expect("<Esc> Cancel");
     Settle();
     Type("root\tlaboratory\r");
@@ -119,7 +116,7 @@ class Session : public Terminal {
   }
 
   void CloseForm() {
-    Type(Keys::ESC);
+    Type(ESC);
     if (!WaitUntil([this] { return IsInMenu(); }, "the menu")) {
       throw std::runtime_error("a form does not close");
     }

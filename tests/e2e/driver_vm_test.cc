@@ -11,6 +11,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 using Lines = std::vector<std::string>;
 
 constexpr char SCENARIO[] = "driver-vm-devices";
@@ -23,13 +25,13 @@ class DriverVMTest : public testing::Test {
     LoadScenario(SCENARIO);
     _operator.emplace();
     // The row's pane has no title of its own.
-    _operator->Press({Keys::DOWN, Keys::DOWN});
+    _operator->Press({DOWN, DOWN});
   }
 
   void Open(const std::string& patch) {
     LoadScenario(SCENARIO, patch);
     _log.emplace();
-    _operator->Press({Keys::ENTER});
+    _operator->Press({ENTER});
     _operator->WaitFor("DriverVM Configuration");
     _operator->Settle();
   }
@@ -116,23 +118,23 @@ TEST_F(DriverVMTest, ListsWhatQualifies) {
     // Without a device these do nothing.
     if (listing.rows.back() == NONE) {
       const std::string picture = _operator->Picture();
-      _operator->Press({Keys::SPACE, "d"});
+      _operator->Press({SPACE, "d"});
       EXPECT_EQ(_operator->Picture(), picture);
     }
-    Close(listing.rows.back() == NONE ? Keys::ESC : Keys::ENTER);
+    Close(listing.rows.back() == NONE ? ESC : ENTER);
   }
 }
 
 TEST_F(DriverVMTest, ShowsTheNamesInFull) {
   Open("");
-  _operator->Press({Keys::DOWN, "D"});
+  _operator->Press({DOWN, "D"});
   _operator->WaitFor("Device Details");
   EXPECT_NE(_operator->Picture().find("Vendor: Nordmark Storage Components Device: Nordmark SAS"),
             std::string::npos);
   _operator->WaitFor("PCI Device: 0000:04:00.0");
-  _operator->Press({Keys::ESC});
+  _operator->Press({ESC});
   _operator->WaitFor("Device Details");
-  _operator->Press({Keys::ENTER});
+  _operator->Press({ENTER});
   EXPECT_EQ(Rows().size(), 6U);
 }
 
@@ -196,17 +198,17 @@ TEST_F(DriverVMTest, MovesADeviceAndAllThatShareItsFate) {
   for (const Toggle& toggle : TOGGLES) {
     SCOPED_TRACE(std::to_string(toggle.row) + " " + toggle.marks + toggle.error);
     Open(toggle.patch);
-    _operator->Press(Lines(static_cast<size_t>(toggle.row), Keys::DOWN));
+    _operator->Press(Lines(static_cast<size_t>(toggle.row), DOWN));
     for (int i = 0; i < toggle.times; ++i) {
-      _operator->Press({Keys::SPACE});
+      _operator->Press({SPACE});
       EXPECT_EQ(_operator->Picture().find(OTHERS_MOVE) != std::string::npos, toggle.warns);
-      if (toggle.warns) _operator->Press({Keys::ENTER});
+      if (toggle.warns) _operator->Press({ENTER});
     }
     EXPECT_EQ(Marks(), toggle.marks);
     EXPECT_EQ(TraceLines(), toggle.trace);
     if (*toggle.error != '\0') _log->WaitFor({"user.err", toggle.error});
     // What was done stays done.
-    Close(Keys::ESC);
+    Close(ESC);
     EXPECT_EQ(TraceLines(), toggle.trace);
   }
 }

@@ -17,10 +17,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
-constexpr char F3[] = "\x1b[13~";
-constexpr char ENTER[] = "\r";
-constexpr char UP[] = "\x1b[A";
-constexpr char DOWN[] = "\x1b[B";
+using namespace Keys;
+
 constexpr char EMPTY_FIELD[] = "[                                ]";
 constexpr char PASSWORD[] = "laboratory";
 constexpr char MENU[] = "<Up/Down> Select";
@@ -29,7 +27,7 @@ void OpenLogin(Terminal& terminal) {
   // A line that an earlier screen has covered. The last draw of this one drops keys.
   terminal.WaitFor("Halden Core 6214 CPU");
   terminal.Settle();
-  terminal.Type(Keys::F2);
+  terminal.Type(F2);
   terminal.WaitFor("<Esc> Cancel");
   terminal.Settle();
 }
@@ -60,7 +58,7 @@ TEST(LoginDialog, ShowsItsFieldsAndModes) {
   terminal.WaitFor("Login Name:        [ root ");
   terminal.WaitFor(EMPTY_FIELD);
   EXPECT_TRUE(terminal.CursorVisible());
-  terminal.Type(Keys::ESC);
+  terminal.Type(ESC);
   terminal.WaitFor("Halden Core 6214 CPU");
   terminal.Settle();
   EXPECT_FALSE(terminal.CursorVisible());
@@ -108,7 +106,7 @@ TEST(LoginDialog, MovesItsFocusByTheKeys) {
       terminal.Type(keys);
       terminal.Settle();
       EXPECT_EQ(FocusedRow(terminal), row) << term << " " << keys << "\n" << terminal.Picture();
-      terminal.Type(Keys::ESC);
+      terminal.Type(ESC);
     }
   }
 }
@@ -139,14 +137,14 @@ TEST(Login, IsRefusedWithItsReason) {
     LogIn(terminal, user, password);
     terminal.WaitFor(denied ? "User does not have permission to login to TARNEL."
                             : "Invalid login or password.");
-    terminal.Type(Keys::ESC);  // Enter alone closes it
+    terminal.Type(ESC);  // Enter alone closes it
     terminal.Type(ENTER);
     terminal.WaitFor(EMPTY_FIELD);
     terminal.WaitFor(std::string("[ ") + user);
     terminal.Settle();
     EXPECT_EQ(FocusedRow(terminal), 2);
     EXPECT_TRUE(terminal.CursorVisible());
-    terminal.Type(Keys::ESC);
+    terminal.Type(ESC);
     std::vector<LogLine> expected = {
         {"auth.err", denied
                          ? "TARNEL: Authorization of user root failed with permission denied error."
@@ -181,7 +179,7 @@ TEST(Menu, OpensAfterALoginAndClosesWithALogOut) {
   terminal.Type(DOWN);
   terminal.WaitFor("192.0.2.20");
   terminal.Settle();
-  terminal.Type(Keys::ESC);
+  terminal.Type(ESC);
   terminal.WaitFor("<F2> Customize");
   log.WaitFor({"user.info", "TARNEL: User root logged out."});
   EXPECT_TRUE(log.Contains({"auth.emerg", "TARNEL: Authentication of user root succeeded"}));
@@ -243,7 +241,7 @@ TEST(Password, IsChangedForGoodAndForgotten) {
       Events().back(),
       "@&!*@*@(notary.user.tarnel.login.passwd.changed)Login password for user empty changed");
   EXPECT_FALSE(Remembers(terminal, secret));
-  terminal.Type(Keys::ESC);
+  terminal.Type(ESC);
   LogIn(terminal, "empty", secret);
   terminal.WaitFor(MENU);
   EXPECT_FALSE(Remembers(terminal, secret));
@@ -299,33 +297,8 @@ TEST(Signals, AreHeededWhileAnOperatorIsLoggedIn) {
   restarted.Signal(SIGUSR2);
   restarted.Settle();
   EXPECT_FALSE(restarted.HasEnded());
-  restarted.Type(Keys::ESC);
+  restarted.Type(ESC);
   EXPECT_EQ(restarted.WaitForEnd(), 0);
-}
-
-// On a clock that runs a hundred times faster, out of a message over a dialog over the menu.
-TEST(IdleOperator, IsLoggedOutWithoutAWord) {
-  LoadScenario("static");
-  const Log log;
-  Terminal terminal(
-      {.environment = {"LD_PRELOAD=/usr/lib/x86_64-linux-gnu/faketime/libfaketime.so.1",
-                       "FAKETIME=+0 x100", "ASAN_OPTIONS=verify_asan_link_order=0"}});
-  terminal.WaitFor("<F2>");
-  const std::string colours = terminal.Colours(20);
-  LogIn(terminal, "root", PASSWORD);
-  terminal.WaitFor(MENU);
-  terminal.Type(ENTER);
-  terminal.WaitFor("Confirm Password:");
-  terminal.Type("x\t");
-  terminal.WaitFor("The old password you entered is incorrect");
-  terminal.WaitFor("<F2> Customize");
-  terminal.Settle();
-  EXPECT_EQ(terminal.Colours(20), colours);
-  EXPECT_FALSE(terminal.CursorVisible());
-  EXPECT_FALSE(log.Contains({"user.info", "TARNEL: User root logged out."}));
-  // Nobody is logged in.
-  terminal.Signal(SIGUSR2);
-  EXPECT_EQ(terminal.WaitForEnd(), 0);
 }
 
 TEST(Password, ThatIsRefusedIsForgotten) {

@@ -12,11 +12,11 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 using Lines = std::vector<std::string>;
 
 constexpr char NETWORK_ROW[] = "Configure Management Network";
-const std::string DOWN = Keys::DOWN;
-const std::string ENTER = Keys::ENTER;
 
 std::string Down(int times) { return times == 0 ? "" : DOWN + Down(times - 1); }
 
@@ -35,7 +35,7 @@ class NetworkScreen : public Operator {
 
   // Leaves the screen with a yes and confirms each message.
   void Apply(const Lines& messages = {}) {
-    Press({Keys::ESC});
+    Press({ESC});
     WaitFor("Apply changes and re");
     Type("y");
     for (const std::string& message : messages) {
@@ -447,7 +447,8 @@ TEST(ApplyChanges, ShowOnTheWelcomeScreen) {
   screen.Edit(2, Down(3) + "192.0.2.30");
   screen.Apply();
   screen.WaitFor("System Customization");
-  screen.Press({Keys::ESC});
+  screen.Settle();
+  screen.Press({ESC});
   screen.WaitFor("http://192.0.2.30/ (STATIC)");
 }
 
@@ -456,10 +457,10 @@ TEST(ApplyChanges, AskBeforeAndRestartTheHostForIpv6) {
   NetworkScreen screen;
   screen.Edit(3, Down(1) + " ");
   EXPECT_EQ(screen.RightPane(4), "IPv6 is enabled.");
-  screen.Press({Keys::ESC});
+  screen.Press({ESC});
   screen.WaitFor("Apply changes and reboot host?");
   // Back on the screen everything is still pending; no drops it.
-  screen.Press({Keys::ESC});
+  screen.Press({ESC});
   EXPECT_EQ(screen.RightPane(4), "IPv6 is enabled.");
   screen.Apply();
   screen.WaitFor("Restart in progress...");
@@ -473,7 +474,7 @@ TEST(ApplyChanges, LeaveTheHostAloneAfterANo) {
   NetworkScreen screen;
   screen.Edit(1, "100");
   const size_t start = TraceLines().size();
-  screen.Press({Keys::ESC, "n"});
+  screen.Press({ESC, "n"});
   screen.WaitFor("System Customization");
   EXPECT_EQ(TraceFrom(start), Lines{});
 }
@@ -488,7 +489,7 @@ struct Restart {
 
 TEST(RestartNetwork, TellsEachStage) {
   // The second Enter means nothing.
-  const Lines confirmed = {ENTER, ENTER, Keys::F11};
+  const Lines confirmed = {ENTER, ENTER, F11};
   const Restart restarts[] = {
       {"sample",
        "",
@@ -526,7 +527,7 @@ struct NetworkTest {
   const char* name;
   std::string keys;
   Lines shown;
-  Lines leave = {Keys::ENTER};
+  Lines leave = {ENTER};
 };
 
 // The sample's gateway and name server, then what is typed over them.
@@ -536,7 +537,7 @@ TEST(TestNetwork, PingsAndResolves) {
   Operator terminal;
   terminal.GoTo("Test Management Network");
   const NetworkTest tests[] = {
-      {"a bad address", "1.2.3" + ENTER, {"Invalid IP or IPv6 address."}, {ENTER, Keys::ESC}},
+      {"a bad address", "1.2.3" + ENTER, {"Invalid IP or IPv6 address."}, {ENTER, ESC}},
       {"no step", "\b" + DOWN + "\b" + DOWN + "\b" + DOWN + "\b" + ENTER, {"<Enter> OK"}},
       {"the host's own",
        ENTER,
@@ -556,6 +557,20 @@ TEST(TestNetwork, PingsAndResolves) {
   }
 }
 
+TEST(TestNetwork, PutsTheHostsFileBackAfterTheConsoleHasEnded) {
+  LoadScenario("ping", R"({"names": {"rack7.example.com": {"answers": [], "delayMs": 500}}})");
+  const std::string hosts = ReadFile("/etc/hosts");
+  Operator terminal;
+  terminal.GoTo("Test Management Network");
+  terminal.Press({ENTER});
+  terminal.Type(ENTER);
+  terminal.WaitFor("Resolving hostname (rack7.example.com).");
+  terminal.WaitUntil([&] { return ReadFile("/etc/hosts") != hosts; }, "the lookup");
+  terminal.Type("\x1c");
+  EXPECT_EQ(terminal.WaitForEnd(), 0);
+  terminal.WaitUntil([&] { return ReadFile("/etc/hosts") == hosts; }, "the file's return");
+}
+
 TEST(TestNetwork, CanBeLeftWhileAStepRuns) {
   LoadScenario("sample", R"({"ping": {"192.0.2.1": {"delayMs": 60000}}})");
   Operator terminal;
@@ -564,7 +579,7 @@ TEST(TestNetwork, CanBeLeftWhileAStepRuns) {
   terminal.WaitFor("Pinging address #1 (192.0.2.1).");
   terminal.Press({ENTER, "x"});
   terminal.WaitFor("<Esc> Cancel");
-  terminal.Press({Keys::ESC});
+  terminal.Press({ESC});
   terminal.WaitFor("<Enter> Run Test");
 }
 

@@ -13,6 +13,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 constexpr char PID_FILE[] = "/var/run/tarnel.pid";
 constexpr char READY[] = "<F12> Shut Down/Restart";
 const LogLine STARTING = {"user.info", "TARNEL: Starting TARNEL"};
@@ -84,7 +86,7 @@ TEST_F(Process, IsNotStoppedByTheSuspendKey) {
   terminal.Type("\x1a");
   terminal.Settle();
   EXPECT_EQ(terminal.Output().size(), before);
-  terminal.Type(Keys::SPACE);
+  terminal.Type(SPACE);
   terminal.WaitUntil([&] { return terminal.Output().size() > before; }, "the picture");
 }
 

@@ -13,6 +13,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 using Lines = std::vector<std::string>;
 
 constexpr char LATTICE[] = "lattice-repair";
@@ -32,14 +34,14 @@ class RecoveryTest : public testing::Test {
   void Open(const std::string& scenario, const std::string& patch = "") {
     LoadScenario(scenario, patch);
     _log.emplace();
-    _operator->Press({Keys::ENTER});
+    _operator->Press({ENTER});
     _operator->WaitFor("Restore Network Settings");
     _operator->Settle();
   }
 
   // Only after a moment the console knows that no sequence follows.
   void Back(const std::string& text) {
-    _operator->Press({Keys::ESC});
+    _operator->Press({ESC});
     _operator->WaitFor(text);
     _operator->Settle();
   }
@@ -86,7 +88,7 @@ class RecoveryTest : public testing::Test {
 };
 
 struct Look {
-  const char* key;
+  std::string key;
   const char* list;
   const char* text;  // the first line of the explanation
   const char* hint;
@@ -104,19 +106,19 @@ TEST_F(RecoveryTest, OffersWhatCanHelp) {
   const std::pair<const char*, std::vector<Look>> visits[] = {
       {"sample",
        {{"", ONE_ROW, SETTINGS_TEXT, CHANGE_HINT},
-        {Keys::DOWN, ONE_ROW, SETTINGS_TEXT, RESTART_HINT},
-        {Keys::UP, ONE_ROW, SETTINGS_TEXT, RESTART_HINT}}},
+        {DOWN, ONE_ROW, SETTINGS_TEXT, RESTART_HINT},
+        {UP, ONE_ROW, SETTINGS_TEXT, RESTART_HINT}}},
       {LATTICE,
        {{"", FIRST, SETTINGS_TEXT, CHANGE_HINT},
-        {Keys::DOWN, SECOND, "All management network and", RESTORE_HINT},
-        {Keys::DOWN, THIRD, "Reconfigure properties of", RESTORE_HINT},
-        {Keys::DOWN, THIRD, "Reconfigure properties of", RESTORE_HINT}}},
+        {DOWN, SECOND, "All management network and", RESTORE_HINT},
+        {DOWN, THIRD, "Reconfigure properties of", RESTORE_HINT},
+        {DOWN, THIRD, "Reconfigure properties of", RESTORE_HINT}}},
   };
   for (const auto& [scenario, looks] : visits) {
     Open(scenario);
     for (const Look& look : looks) {
       SCOPED_TRACE(std::string(scenario) + " " + look.list);
-      if (*look.key != '\0') _operator->Press({look.key});
+      if (!look.key.empty()) _operator->Press({look.key});
       EXPECT_EQ(List(), look.list);
       EXPECT_EQ(_operator->RightPane(4), look.text);
       EXPECT_EQ(_operator->RightPane(22), look.hint);
@@ -153,20 +155,20 @@ const Reset RESETS[] = {
      {CLEARING, CONFIGURING, RESTORING, NOTARY}},
     {"virtual-machines",
      "",
-     {Keys::ENTER},
+     {ENTER},
      "Powering Off VMs. Done.|Auto-configuring network. Done.",
      {POWER_OFF, DUMPER, CLEAR, CONFIGURE},
      {CLEARING, CONFIGURING, RESTORING, NOTARY}},
-    {"virtual-machines", "", {Keys::ESC}, nullptr, {}, {RESTORING, NOTARY}},
+    {"virtual-machines", "", {ESC}, nullptr, {}, {RESTORING, NOTARY}},
     {"power-off-fails",
      "",
-     {Keys::ENTER},
+     {ENTER},
      "Powering Off VMs. Failed.",
      {POWER_OFF, DUMPER},
      {"err Error powering off VMs", RESTORING, NOTARY}},
     {"power-off-fails",
      R"({"faults": [{"operation": "NetworkInfoImpl::DisableNetDumper", "message": "told"}]})",
-     {Keys::ENTER},
+     {ENTER},
      "Powering Off VMs. Failed.",
      {POWER_OFF, DUMPER},
      {RESET_FAILED, RESTORING, NOTARY}},
@@ -197,9 +199,9 @@ TEST_F(RecoveryTest, ResetsTheNetwork) {
     SCOPED_TRACE(std::string(reset.scenario) + reset.patch + (reset.progress ? "" : " backed out"));
     Open(reset.scenario, reset.patch);
     // Enter is no answer here.
-    _operator->Press({Keys::ENTER, Keys::ENTER});
+    _operator->Press({ENTER, ENTER});
     EXPECT_TRUE(Shows("Are you sure you want to reset the host network"));
-    _operator->Press({Keys::F11});
+    _operator->Press({F11});
     EXPECT_EQ(Shows("Warning: VMs running on the host"), !reset.keys.empty());
     _operator->Press(reset.keys);
     _operator->WaitFor(reset.progress != nullptr ? "<Enter> OK" : "<Esc> Exit");
@@ -210,9 +212,9 @@ TEST_F(RecoveryTest, ResetsTheNetwork) {
       const std::string all = first.substr(0, first.find('.', first.find('.') + 1) + 1) +
                               (second[0] == ' ' ? "" : "|" + second.substr(0, 31));
       EXPECT_EQ(all, reset.progress);
-      _operator->Press({Keys::ESC, Keys::F11});
+      _operator->Press({ESC, F11});
       EXPECT_TRUE(Shows("<Enter> OK"));
-      _operator->Press({Keys::ENTER});
+      _operator->Press({ENTER});
     }
     EXPECT_EQ(_operator->RightPane(22), CHANGE_HINT);
     EXPECT_EQ(HostChanges(), reset.trace);
@@ -227,14 +229,14 @@ TEST_F(RecoveryTest, MovesToAStandardSwitchOncePerVisit) {
                           "message": "told"}]})"};
   for (const std::string patch : patches) {
     Open(LATTICE, patch);
-    _operator->Press({Keys::DOWN, Keys::ENTER, Keys::ENTER});
+    _operator->Press({DOWN, ENTER, ENTER});
     EXPECT_TRUE(Shows("Move the management network onto a standard switch?"));
     Back("<Esc> Exit");
     EXPECT_EQ(List(), SECOND);
-    _operator->Press({Keys::ENTER, Keys::F11});
+    _operator->Press({ENTER, F11});
     EXPECT_EQ(List(), SECOND_IS_GREY);
     EXPECT_EQ(_operator->RightPane(22), CHANGE_HINT);
-    _operator->Press({Keys::UP});
+    _operator->Press({UP});
     EXPECT_EQ(_operator->RightPane(1), "Restore Network Settings");
     Lines log = {
         "info Enabling safe mode networking by moving all uplinks to a new management softSwitch"};
@@ -260,30 +262,30 @@ const std::string FIELD_GAP(23, ' ');
 
 TEST_F(RecoveryTest, RepairsTheLatticePort) {
   Open(LATTICE);
-  _operator->Press({Keys::DOWN, Keys::DOWN, Keys::ENTER});
+  _operator->Press({DOWN, DOWN, ENTER});
   EXPECT_EQ(Form(*_operator),
             "Management Interface - core0\nCurrent LatticePort - 100\n"
             "[ ] Restore to default blocked setting (unblocked)\nSelect Lattice uplinks\n"
             "Please enter a valid VLAN ID (1-4094)." +
                 FIELD_GAP + " [ 4095  ]\n");
   // No uplink is chosen yet; Enter has no meaning on the first row.
-  _operator->Press({Keys::ENTER, Keys::F11});
+  _operator->Press({ENTER, F11});
   EXPECT_TRUE(Shows("No uplinks were selected."));
   Back("Select Lattice uplinks");
-  _operator->Press({Keys::SPACE, Keys::DOWN, Keys::SPACE, Keys::ENTER});
+  _operator->Press({SPACE, DOWN, SPACE, ENTER});
   EXPECT_TRUE(Shows("    Uplink Name"));
   // Marked, both, taken back, marked again: it goes last.
-  _operator->Press({Keys::SPACE, Keys::DOWN, Keys::SPACE, Keys::UP, Keys::SPACE, Keys::SPACE});
+  _operator->Press({SPACE, DOWN, SPACE, UP, SPACE, SPACE});
   EXPECT_TRUE(Shows("[X] Uplink 1"));
   EXPECT_TRUE(Shows("[X] Uplink 2"));
-  _operator->Press({Keys::ENTER});
+  _operator->Press({ENTER});
   EXPECT_FALSE(_operator->CursorVisible());
-  _operator->Press({Keys::DOWN});
+  _operator->Press({DOWN});
   EXPECT_TRUE(_operator->CursorVisible());
   _operator->Press({"x", "4", "3", "\b", "2"});
   EXPECT_TRUE(Shows("[X] Restore to default blocked setting (unblocked)"));
   EXPECT_TRUE(Shows("[ 42    ]"));
-  _operator->Press({Keys::F11});
+  _operator->Press({F11});
   EXPECT_FALSE(_operator->CursorVisible());
   EXPECT_EQ(_operator->RightPane(22), CHANGE_HINT);
   const Lines trace = TraceLines();
@@ -314,33 +316,33 @@ constexpr char STANDARD_PATCH[] = R"({"network": {"kernelNics": {"core0": {"conn
 
 const Repair REPAIRS[] = {
     {"",
-     {Keys::F11, Keys::ENTER},
+     {F11, ENTER},
      {FAILED},
      {"err Unable to create Host Local Port: Invalid LatticePort vlan specified. Valid range is "
       "0-4094."},
      0},
-    {"", {Keys::DOWN, Keys::DOWN, "\b", Keys::F11, Keys::ENTER}, {}, {}, 19},
+    {"", {DOWN, DOWN, "\b", F11, ENTER}, {}, {}, 19},
     {R"({"faults": [{"operation": "NetworkInterface::SetConnectionPoint", "message": "told"}]})",
-     {Keys::DOWN, Keys::DOWN, "1", Keys::F11, Keys::ENTER},
+     {DOWN, DOWN, "1", F11, ENTER},
      {FAILED},
      {"err Unable to create Host Local Port: told"},
      20},
-    {FOREIGN_PATCH, {Keys::F11, Keys::ENTER}, {FOREIGN}, {}, 0},
-    {FOREIGN_PATCH, {Keys::DOWN, Keys::ENTER}, {FOREIGN, NO_UPLINKS, ""}, {}, 0},
+    {FOREIGN_PATCH, {F11, ENTER}, {FOREIGN}, {}, 0},
+    {FOREIGN_PATCH, {DOWN, ENTER}, {FOREIGN, NO_UPLINKS, ""}, {}, 0},
     {R"({"network": {"lattices": {"50 2a 11": {"uplinkPorts": {"corenic0": "77",
                                                                "corenic1": null}}}}})",
-     {Keys::DOWN, Keys::ENTER},
+     {DOWN, ENTER},
      {NO_UPLINKS, ""},
      {},
      0},
     {STANDARD_PATCH,
-     {Keys::F11, Keys::ENTER},
+     {F11, ENTER},
      {},
      {"err Failed to get Management Interface: Unable to find lattice",
       "err Unable to get Lattice"},
      0},
     {R"({"network": {"management": null}})",
-     {Keys::DOWN, Keys::ENTER},
+     {DOWN, ENTER},
      {NO_UPLINKS, ""},
      {"err Failed to get Management Interface: Could not find the management network"},
      0},
@@ -351,14 +353,14 @@ TEST_F(RecoveryTest, TellsWhyALatticeCannotBeRepaired) {
     SCOPED_TRACE(std::string(repair.patch) + std::to_string(&repair - REPAIRS));
     Open(LATTICE);
     SetState(repair.patch[0] == '\0' ? "{}" : repair.patch);
-    _operator->Press({Keys::DOWN, Keys::DOWN, Keys::ENTER});
+    _operator->Press({DOWN, DOWN, ENTER});
     _operator->Press(repair.keys);
     for (const std::string& message : repair.messages) {
       EXPECT_TRUE(Shows(message.empty() ? "Select Lattice uplinks" : message)) << message;
       if (message.empty()) {
         Back("<Esc> Exit");
       } else {
-        _operator->Press({Keys::ENTER});
+        _operator->Press({ENTER});
       }
     }
     EXPECT_EQ(_operator->RightPane(22), CHANGE_HINT);

@@ -11,12 +11,12 @@ namespace Tarnel::Testing {
 
 namespace {
 
-constexpr char F11[] = "\x1b[23~";
-constexpr char ENTER[] = "\r";
+using namespace Keys;
+
 constexpr char DIALOG[] = "[ ] Forcefully terminate running VMs";
 constexpr char EVENT[] = "NotaryUserLib_AddEvent \"@&!*@*@(notary.user.tarnel.";
 
-void LogIn(Terminal& terminal, const char* key) {
+void LogIn(Terminal& terminal, const std::string& key) {
   terminal.WaitFor("Halden Core 6214 CPU");
   terminal.Type(key);
   terminal.WaitFor("<Esc> Cancel");
@@ -34,15 +34,15 @@ struct Way {
 
 TEST(ShutdownDialog, StopsTheMachinesAndThenTheHost) {
   const Way ways[] = {
-      {Keys::F2, "Shutdown in progress...", "shutdown.host)Shutting down host\"", "powerOffVms",
+      {F2, "Shutdown in progress...", "shutdown.host)Shutting down host\"", "powerOffVms",
        "program /sbin/poweroff poweroff"},
-      {std::string(Keys::SPACE) + F11, "Restart in progress...", "reboot.host)Rebooting host\"",
+      {std::string(SPACE) + F11, "Restart in progress...", "reboot.host)Rebooting host\"",
        "powerOffVms --terminate", "program /sbin/reboot reboot"},
   };
   for (const auto& [keys, screen, event, powerOff, command] : ways) {
     LoadScenario("host-stays-up");
     Terminal terminal;
-    LogIn(terminal, Keys::F12);
+    LogIn(terminal, F12);
     terminal.WaitFor(DIALOG);
     terminal.Type(ENTER);  // means nothing here
     terminal.Settle();
@@ -53,7 +53,7 @@ TEST(ShutdownDialog, StopsTheMachinesAndThenTheHost) {
         "program /bin/stew-cmd stew-cmd -U root hostsvc/autostartmanager/autostop",
         std::string("program /bin/powerOffVms ") + powerOff, command};
     terminal.WaitUntil([&] { return TraceLines() == trace; }, command);
-    terminal.Type(std::string(Keys::ESC) + ENTER);
+    terminal.Type(std::string(ESC) + ENTER);
     terminal.Settle();
     terminal.WaitFor(screen);
   }
@@ -63,9 +63,9 @@ TEST(ShutdownDialog, ComesBackWhenNothingCanBeStarted) {
   LoadScenario("no-shell", R"({"notary": {"init": 5}})");
   const Log log;
   Terminal terminal;
-  LogIn(terminal, Keys::F12);
+  LogIn(terminal, F12);
   terminal.WaitFor(DIALOG);
-  terminal.Type(std::string(Keys::SPACE) + Keys::F2);
+  terminal.Type(std::string(SPACE) + F2);
   log.WaitFor(
       {"user.err", "TARNEL: Unable to initialize notaryuser library from TARNEL. Error code: 5"});
   terminal.WaitUntil([] { return GetState("/virtualMachines/1/running") == "false\n"; },
@@ -75,7 +75,7 @@ TEST(ShutdownDialog, ComesBackWhenNothingCanBeStarted) {
   terminal.WaitFor("<F11> Restart");
   const std::vector<LogLine> lines = log.Lines();
   EXPECT_EQ(lines[lines.size() - 3], (LogLine{"user.info", "TARNEL: Shutting down host"}));
-  terminal.Type(Keys::ESC);
+  terminal.Type(ESC);
   terminal.WaitFor("Halden Core 6214 CPU");
 }
 
@@ -83,9 +83,9 @@ TEST(RestoreDialog, ResetsTheHostAndRestartsItAtEnter) {
   LoadScenario("host-stays-up", R"({"hardware": {"cpu": {"packages": 4}}})");
   const Log log;
   Terminal terminal;
-  LogIn(terminal, Keys::F2);
+  LogIn(terminal, F2);
   terminal.WaitFor("<Up/Down> Select");
-  for (int row = 0; row < 12; ++row) terminal.Type("\x1b[B");
+  for (int row = 0; row < 12; ++row) terminal.Type(DOWN);
   terminal.WaitFor("revert");
   terminal.Type(ENTER);
   terminal.WaitFor("Reset System Configuration now?");
@@ -93,7 +93,7 @@ TEST(RestoreDialog, ResetsTheHostAndRestartsItAtEnter) {
   terminal.Settle();
   terminal.Type(F11);
   terminal.WaitFor("Default settings are restored.");
-  terminal.Type(std::string(Keys::ESC) + F11);
+  terminal.Type(std::string(ESC) + F11);
   terminal.Settle();
   EXPECT_EQ(terminal.Picture().find("Reset System Configuration now?"), std::string::npos);
   EXPECT_EQ(GetState("/hardware/cpu/packages"), "1\n");

@@ -14,6 +14,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 // The colours of rows 1, 12, 13 and 23.
 using Look = std::vector<std::string>;
 const Look COLOURED = {"6/7*80", "3/7*80", "3/7*8 3/0*64 3/7*8",
@@ -43,7 +45,7 @@ TEST(TerminalType, ShowsTheSamePictureInColourOrWithout) {
     terminal.Type("\0334");
     terminal.Settle();
     EXPECT_EQ(LookOf(terminal), MONOCHROME);
-    terminal.Type(Keys::F4);
+    terminal.Type(F4);
     terminal.Settle();
     EXPECT_EQ(LookOf(terminal), colour ? COLOURED : MONOCHROME);
     EXPECT_EQ(terminal.Picture(), PICTURE);
@@ -78,7 +80,7 @@ TEST(UnusableTerminal, IsSurvived) {
         Launch{.columns = 300, .rows = 100}}) {
     Terminal terminal(launch);
     terminal.Settle();
-    terminal.Type(std::string(Keys::SPACE) + Keys::F4 + Keys::F4);
+    terminal.Type(std::string(SPACE) + F4 + F4);
     terminal.Settle();
     terminal.Signal(SIGTERM);
     EXPECT_EQ(terminal.WaitForEnd(), 0) << launch.columns << "x" << launch.rows;
@@ -104,7 +106,7 @@ TEST(LoneEscape, ActsAtOnceWhereNobodyTypesSequencesByHand) {
     terminal.Settle();
     const size_t before = terminal.Output().size();
     const auto start = std::chrono::steady_clock::now();
-    terminal.Type(Keys::ESC);
+    terminal.Type(ESC);
     terminal.WaitUntil([&] { return terminal.Output().size() > before; }, "the picture");
     const auto time = std::chrono::steady_clock::now() - start;
     EXPECT_GE(time, least) << launch.term;
@@ -131,12 +133,9 @@ TEST(RandomKeys, AreSurvived) {
   EXPECT_FALSE(terminal.HasEnded());
 }
 
-// On a clock that runs two hundred times faster.
 TEST(WelcomeScreenThatIsLeftAlone, DimsUntilAKeyComes) {
   LoadScenario("static");
-  Terminal terminal(
-      {.environment = {"LD_PRELOAD=/usr/lib/x86_64-linux-gnu/faketime/libfaketime.so.1",
-                       "FAKETIME=+0 x200", "ASAN_OPTIONS=verify_asan_link_order=0"}});
+  Terminal terminal({.environment = ClockTimes(200)});
   terminal.WaitForPicture(PICTURE);
   terminal.WaitUntil([&] { return LookOf(terminal) == DIMMED; }, "the dimmed screen");
   EXPECT_EQ(terminal.Picture(), PICTURE);
@@ -146,7 +145,7 @@ TEST(WelcomeScreenThatIsLeftAlone, DimsUntilAKeyComes) {
   terminal.WaitFor("Fresh");
   terminal.Settle();
   EXPECT_EQ(LookOf(terminal), DIMMED);
-  terminal.Type(Keys::SPACE);
+  terminal.Type(SPACE);
   terminal.WaitUntil([&] { return LookOf(terminal) == COLOURED; }, "the colours");
 }
 

@@ -13,12 +13,10 @@ namespace Tarnel::Testing {
 
 namespace {
 
-using Keys::ESC;
+using namespace Keys;
+
 using std::string;
 
-const string ENTER = "\r";
-const string DOWN = "\x1b[B";
-const string F11 = "\x1b[23~";
 constexpr char TITLE[] = "Troubleshooting Mode Options";
 constexpr char CHANGE_HINT[] = "<Enter> Change";
 constexpr char CANCEL[] = "<Esc> Cancel";
@@ -37,7 +35,7 @@ class TroubleshootingTest : public testing::Test {
     // Else a key that comes soon after Esc belongs to it.
     _terminal.emplace(Launch{.environment = {"ESCDELAY=20"}});
     Screen().WaitFor("Halden Core 6214 CPU");
-    Press({Keys::F2, "root", "\tlaboratory\r"});
+    Press({F2, "root", "\tlaboratory\r"});
     Screen().WaitFor("System Customization");
     Screen().Settle();
     Press({DOWN + DOWN + DOWN + DOWN + DOWN + DOWN + DOWN});
@@ -238,8 +236,11 @@ TEST_F(TroubleshootingTest, SetsTheTimeouts) {
   // Started behind the window's back.
   const char* const sshStarted =
       R"({"programs": {"/etc/init.d/SSH": [{"args": ["status"], "fromCall": 2, "exit": 0}]}})";
+  const char* const negative =
+      R"({"options": {"advanced": {"/UserVars/OstrelShellTimeOut": {"value": -60}}}})";
   const Case cases[] = {
       {"sample", TEN_AND_TWO_MINUTES, shell, read, ""},
+      {"sample", negative, shell, read, ""},
       {"sample", TEN_AND_TWO_MINUTES, shell + "\x7f", read, ""},
       {"sample", TEN_AND_TWO_MINUTES, shell + "10" + DOWN + "2", read, ""},
       {"sample", TEN_AND_TWO_MINUTES, shell + "1440",

@@ -10,12 +10,10 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 using Lines = std::vector<std::string>;
 
-const std::string DOWN = Keys::DOWN;
-const std::string ENTER = Keys::ENTER;
-const std::string ESC = Keys::ESC;
-const std::string F11 = Keys::F11;
 
 struct Stop {
   // Keys that lead here from the stop before.
@@ -94,7 +92,7 @@ TEST(Walk, ThroughTheMenuAndBack) {
                   {{F11}, 71, 20, 9, OK},
                   {{ENTER, ESC, DOWN, DOWN, DOWN, ENTER}, 60, 12, 7, "<F11> OK  <Esc> Cancel"}});
   terminal.Press({ESC});
-  terminal.PressTimes(Keys::UP, 12);
+  terminal.PressTimes(UP, 12);
   EXPECT_EQ(terminal.Picture(), first);
   terminal.Press({ESC});
   terminal.WaitFor("<F2> Customize");
@@ -115,7 +113,7 @@ TEST(Walk, ThroughTheWaysBackOfADistributedSwitch) {
          5,
          OK,
          R"({"faults": [{"operation": "LatticePort::GetLatticeSwitch", "returns": null}]})"},
-        {{ENTER, ESC, Keys::UP, Keys::UP, ENTER, F11, ENTER}, 60, 12, 6, OK}});
+        {{ENTER, ESC, UP, UP, ENTER, F11, ENTER}, 60, 12, 6, OK}});
 }
 
 TEST(Walk, ThroughTheDevicesOfTheDriverVM) {

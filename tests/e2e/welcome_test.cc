@@ -13,6 +13,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 TEST(WelcomeScreen, ShowsTheWholePictureAndAWrongOneIsNoticed) {
   const std::string picture =
       "+------------------------------------------------------------------------------+\n"
@@ -101,7 +103,7 @@ TEST(HostState, IsShownAtAKey) {
   for (const auto& [scenario, addresses, warning] : HOSTS) {
     SCOPED_TRACE(scenario);
     LoadScenario(scenario);
-    terminal.Type(Keys::SPACE);
+    terminal.Type(SPACE);
     welcome.network = {STATIC_NETWORK.front()};
     welcome.network.insert(welcome.network.end(), addresses.begin(), addresses.end());
     welcome.warning = warning;
@@ -109,7 +111,7 @@ TEST(HostState, IsShownAtAKey) {
   }
   LoadScenario("static", R"({"hardware": {"cpu": {"model": "Slower", "packages": 4},
                                           "firmware": {"product": "Halden Systems 9"}}})");
-  terminal.Type(Keys::SPACE);
+  terminal.Type(SPACE);
   terminal.WaitForPicture(WelcomePicture(
       {.machine = "Halden Systems 9", .processor = "4 x Slower", .columns = 132, .rows = 50}));
 }
@@ -122,7 +124,7 @@ TEST(HostStateWithoutAdapters, IsShownAtEachDrawAndAlertedOnce) {
         WelcomePicture({.network = {"No compatible network adapter found. Please consult the",
                                     "product's Hardware Compatibility Guide (HCG) for a list of",
                                     "supported adapters."}}));
-    terminal.Type(Keys::SPACE);
+    terminal.Type(SPACE);
     terminal.Settle();
   }
   EXPECT_EQ(TraceLines(),
@@ -140,11 +142,11 @@ TEST(HostThatFails, LeavesWhatStoodThere) {
   blank.replace(blank.find(product), product.size(), product.size(), ' ');
   terminal.WaitForPicture(blank);
   SetState(R"({"faults": []})");
-  terminal.Type(Keys::SPACE);
+  terminal.Type(SPACE);
   terminal.WaitForPicture(WelcomePicture());
   SetState(R"({"hardware": {"cpu": {"model": "Another"}},
                "faults": [{"operation": "NetworkInfoImpl::GetPnics", "message": "No."}]})");
-  terminal.Type(Keys::SPACE);
+  terminal.Type(SPACE);
   terminal.WaitForPicture(WelcomePicture({.network = {}}));
 }
 
@@ -155,7 +157,7 @@ TEST(WelcomeMessage, TakesTheWholeScreenAsLongAsItIsThere) {
     terminal.WaitForPicture(WelcomePicture());
     EXPECT_EQ(terminal.Colours(12), "3/7*80");
     SetState(R"({"host": {"welcomeMessage": "{align:center}Hello{/align}\n{bgcolor:red}!"}})");
-    terminal.Type(Keys::SPACE);
+    terminal.Type(SPACE);
     terminal.WaitFor("Hello");
     terminal.Settle();
     EXPECT_EQ(terminal.Row(2), "|" + std::string(36, ' ') + "Hello" + std::string(37, ' ') + "|");
@@ -165,7 +167,7 @@ TEST(WelcomeMessage, TakesTheWholeScreenAsLongAsItIsThere) {
     }
     EXPECT_EQ(terminal.Colours(12), "0/7*80");
     SetState(R"({"host": {"welcomeMessage": ""}})");
-    terminal.Type(Keys::SPACE);
+    terminal.Type(SPACE);
   }
 }
 

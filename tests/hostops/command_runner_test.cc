@@ -90,6 +90,20 @@ TEST(RunCommand, KillsAtTheLimitAndDeliversWhatCame) {
                                 "user.err Run Command did not terminate normally"}));
 }
 
+TEST(RunCommand, KillsWhatStops) {
+  sigset_t childSignal;
+  sigemptyset(&childSignal);
+  sigaddset(&childSignal, SIGCHLD);
+  pthread_sigmask(SIG_BLOCK, &childSignal, nullptr);
+  const Log log;
+  const CommandResult result = RunShell("echo begun; kill -TSTP $$; echo ended");
+  pthread_sigmask(SIG_UNBLOCK, &childSignal, nullptr);
+  EXPECT_EQ(result.code, -1);
+  EXPECT_EQ(result.out, "begun\n");
+  EXPECT_EQ(waitpid(-1, nullptr, WNOHANG), -1) << "the child was not reaped";
+  EXPECT_EQ(Logged(log), Lines({"user.err Run Command did not terminate normally"}));
+}
+
 TEST(RunCommand, AFailedStartGivesNothing) {
   const std::string before = OpenDescriptors();
   const Log log;

@@ -9,7 +9,7 @@ namespace Tarnel::Testing {
 
 namespace {
 
-constexpr char ESC[] = "\x1b";
+using namespace Keys;
 
 // Sorted: corenic0, which the management network has; upnic2 on another standard switch; upnic10 on
 // a distributed one; upnic11 on none.

@@ -6,6 +6,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 using Nodeplane::Network::IpAddress;
 using Nodeplane::Network::Ipv4Address;
 using Nodeplane::Network::Ipv6Address;

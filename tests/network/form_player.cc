@@ -8,6 +8,8 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 // What opens the form.
 class Opener : public Frame {
  public:

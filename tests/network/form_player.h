@@ -6,16 +6,12 @@
 #include <string>
 
 #include "shell/frame.h"
-#include "tests/shell/fake_time.h"
-#include "tests/shell/signal_thread.h"
 #include "tests/support/curses_screen.h"
+#include "tests/support/fake_time.h"
+#include "tests/support/keys.h"
+#include "tests/support/signal_thread.h"
 
 namespace Tarnel::Testing {
-
-inline constexpr char UP[] = "\x1b[A";
-inline constexpr char DOWN[] = "\x1b[B";
-inline constexpr char END[] = "\x1b[4~";
-inline constexpr char BACKSPACE[] = "\x7f";
 
 // Forms on a screen in process, and the operator in front of them, who types each key only when
 // the last one has been dealt with.

@@ -11,12 +11,12 @@ namespace Tarnel::Testing {
 
 namespace {
 
+using namespace Keys;
+
 using Nodeplane::Network::IpConfig;
 using Nodeplane::Network::Ipv4Address;
 using Nodeplane::Network::Ipv6Address;
 using Nodeplane::Network::Ipv6Network;
-
-constexpr char ESC[] = "\x1b";
 
 std::string Times(int count, const std::string& keys) {
   std::string repeated;

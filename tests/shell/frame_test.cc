@@ -12,10 +12,10 @@
 
 #include "shell/colours.h"
 #include "shell/screen.h"
-#include "tests/shell/fake_time.h"
-#include "tests/shell/signal_thread.h"
 #include "tests/support/curses_screen.h"
+#include "tests/support/fake_time.h"
 #include "tests/support/lab.h"
+#include "tests/support/signal_thread.h"
 
 namespace Tarnel {
 

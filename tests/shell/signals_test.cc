@@ -8,8 +8,8 @@
 #include <thread>
 
 #include "shell/frame.h"
-#include "tests/shell/signal_thread.h"
 #include "tests/support/curses_screen.h"
+#include "tests/support/signal_thread.h"
 
 namespace Tarnel {
 

@@ -24,6 +24,20 @@ int ColourNumber(const VTermColor& colour) {
   return VTERM_COLOR_IS_INDEXED(&colour) ? colour.indexed.idx : NO_PALETTE_COLOUR;
 }
 
+// How many bytes at the end begin a character that is not complete yet.
+size_t UnfinishedBytes(const std::string& text) {
+  constexpr size_t LONGEST = 4;
+  for (size_t tail = 1; tail < LONGEST && tail <= text.size(); ++tail) {
+    const auto byte = static_cast<unsigned char>(text[text.size() - tail]);
+    if (byte >= 0xc0) {
+      const size_t length = byte >= 0xf0 ? 4 : byte >= 0xe0 ? 3 : 2;
+      return tail < length ? tail : 0;
+    }
+    if (byte < 0x80) break;
+  }
+  return 0;
+}
+
 }  // namespace
 
 Emulator::Emulator(int columns, int rows)
@@ -68,6 +82,10 @@ std::string Emulator::TakeStandardPart() {
     standard.append(length == 0 ? 1 : 0, start[0]);
   }
   _pending.erase(0, at);
+  // The library mistakes a character that comes in two parts.
+  const size_t unfinished = UnfinishedBytes(standard);
+  _pending.insert(0, standard, standard.size() - unfinished, unfinished);
+  standard.resize(standard.size() - unfinished);
   return standard;
 }
 

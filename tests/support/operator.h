@@ -7,13 +7,6 @@
 
 namespace Tarnel::Testing {
 
-namespace Keys {
-inline constexpr char DOWN[] = "\x1b[B";
-inline constexpr char UP[] = "\x1b[A";
-inline constexpr char ENTER[] = "\r";
-inline constexpr char F11[] = "\x1b[23~";
-}  // namespace Keys
-
 // The console with an operator who is logged in and sees the menu.
 class Operator : public Terminal {
  public:

@@ -72,6 +72,11 @@ bool Sleeps(pid_t pid) {
 
 }  // namespace
 
+std::vector<std::string> ClockTimes(int factor) {
+  return {"LD_PRELOAD=/lib/libfaketime.so.1", "FAKETIME=+0 x" + std::to_string(factor),
+          "ASAN_OPTIONS=verify_asan_link_order=0"};
+}
+
 Terminal::Terminal(const Launch& launch) : Emulator(launch.columns, launch.rows) {
   const winsize size = WindowSize(launch.columns, launch.rows);
   int master = -1;

@@ -11,18 +11,10 @@
 
 #include "tests/support/descriptor.h"
 #include "tests/support/emulator.h"
+#include "tests/support/keys.h"
 #include "tests/support/wait.h"
 
 namespace Tarnel::Testing {
-
-// What a key sends, whatever the terminal type.
-namespace Keys {
-inline constexpr char F2[] = "\x1b[12~";
-inline constexpr char F4[] = "\x1b[14~";
-inline constexpr char F12[] = "\x1b[24~";
-inline constexpr char ESC[] = "\x1b";
-inline constexpr char SPACE[] = " ";
-}  // namespace Keys
 
 struct Launch {
   std::string program = "/bin/tarnel";
@@ -32,6 +24,9 @@ struct Launch {
   int rows = 25;
   std::vector<std::string> environment = {};  // "NAME=value", besides TERM and PATH
 };
+
+// Environment of a program whose clock runs so many times faster.
+std::vector<std::string> ClockTimes(int factor);
 
 // A program on a pseudo-terminal that it controls, and the operator in front of it: the terminal
 // shows what the program had written when the last wait ended. Every wait has a deadline; one that

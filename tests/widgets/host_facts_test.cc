@@ -125,7 +125,8 @@ TEST(Facts, PassTheHostsFailureOn) {
 TEST(Facts, LogWhatCannotBeHad) {
   LoadScenario("firmware-rich", R"({
       "hardware": {"drivers": {"plsa": null}},
-      "faults": [{"operation": "DriverService::FindDriver", "message": "no such driver"}],
+      "faults": [{"operation": "DriverService::FindDriver", "message": "no such driver", "times": 1},
+                 {"operation": "DriverService::FindDriver", "returns": null}],
       "programs": {"/usr/lib/halvren/openssh/bin/ssh-keygen": [
           {"exit": 255, "stdout": "3072 SHA256:no", "stderr": "no such %s"}]}})");
   openlog("TARNEL", 0, LOG_USER);
@@ -134,6 +135,9 @@ TEST(Facts, LogWhatCannotBeHad) {
   EXPECT_EQ(GetHardwareVersion(5), "N/A");
   EXPECT_EQ(TextArea::GetSSHRsaKeyFingerprintValue(), "");
   log.WaitFor({"user.err", "TARNEL: Get sthba0 version string failed, err=no such driver"});
+  EXPECT_EQ(TextArea::GetPLSAVersion(), "N/A");
+  log.WaitFor(
+      {"user.err", "TARNEL: Get sthba0 version string failed, err=The host has no such driver"});
   log.WaitFor({"user.err", "TARNEL: Invalid version id: 5 requested"});
   log.WaitFor({"user.info", "TARNEL: Error generating SSH Key Fingerprint: no such %s"});
 }

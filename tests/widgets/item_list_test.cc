@@ -200,5 +200,17 @@ TEST_F(ItemListTest, HasNoBarWhenAllFits) {
   EXPECT_EQ(_screen.Picture(), "");
 }
 
+TEST_F(ItemListTest, ShowsNothingWithoutRoom) {
+  for (const char* const label : {"a", "b", "c"}) Add<LabelItem>(label, true);
+  _list = _window.Add<ItemList>(0, 0, COLUMNS, 0);
+  Show();
+  _list->MoveDown();
+  _list->MoveDown();
+  _list->MoveUp();
+  Paint();
+  EXPECT_EQ(_screen.Picture(), "");
+  EXPECT_EQ(_list->SelectionIndex(), 1);
+}
+
 }  // namespace
 }  // namespace Tarnel::Testing

@@ -1,4 +1,4 @@
-#include "tests/shell/fake_time.h"
+#include "tests/support/fake_time.h"
 
 #include <dlfcn.h>
 #include <sys/select.h>
