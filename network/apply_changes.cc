@@ -8,10 +8,12 @@
 #include <cctype>
 
 #include "hostapi/coreplane/network_info.h"
+#include "hostapi/nodeplane/exception.h"
 #include "hostops/command_runner.h"
 #include "hostops/shutdown_dialogs.h"
 #include "network/address_text.h"
 #include "network/apply_changes_dialog.h"
+#include "network/error_text.h"
 #include "network/network_window.h"
 #include "network/switch_operations.h"
 #include "shell/screen.h"

@@ -3,6 +3,7 @@
 #include <syslog.h>
 
 #include "hostapi/coreplane/network_info.h"
+#include "hostapi/nodeplane/exception.h"
 #include "hostops/command_runner.h"
 #include "network/adapters_dialog.h"
 #include "network/address_text.h"

@@ -25,8 +25,7 @@ enum Event : int {
 };
 
 // A top-level window with an input loop: the unit of modal interaction. A frame that is started
-// from another dims it for as long as it runs. WaitKey() is the only place where the process waits
-// for the operator.
+// from another dims it for as long as it runs.
 class Frame : public Window {
  public:
   Frame(Frame* parent, int x, int y, int width, int height, int bg, int fg);
@@ -53,7 +52,7 @@ class Frame : public Window {
   // Some inserted card carries this user id.
   static bool IsSmartCardPresent(const std::string& user);
 
-  // A key, or an Event. A null timeout waits for ever. With a signal mask there is no timeout: that
+  // The only place where the process waits for the operator. Gives a key, or an Event. A null timeout waits for ever. With a signal mask there is no timeout: that
   // mask holds while the process sleeps, and a signal that was handled then gives EVENT_NONE.
   static int WaitEvent(timeval* timeout, const sigset_t* mask = nullptr);
   // Takes the terminal's new size into curses and logs it.

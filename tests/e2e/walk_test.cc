@@ -14,7 +14,6 @@ using namespace Keys;
 
 using Lines = std::vector<std::string>;
 
-
 struct Stop {
   // Keys that lead here from the stop before.
   Lines keys;
@@ -114,6 +113,21 @@ TEST(Walk, ThroughTheWaysBackOfADistributedSwitch) {
          OK,
          R"({"faults": [{"operation": "LatticePort::GetLatticeSwitch", "returns": null}]})"},
         {{ENTER, ESC, UP, UP, ENTER, F11, ENTER}, 60, 12, 6, OK}});
+}
+
+TEST(Walk, ThroughTheDialogsOfTheWelcomeScreen) {
+  for (const std::string& way : {F2, F11}) {
+    LoadScenario("host-stays-up");
+    Operator terminal;
+    terminal.Press({ESC});
+    LoadScenario("login-disabled");
+    Walk(terminal, {{{F2}, 60, 9, 6, OK}});
+    LoadScenario("host-stays-up");
+    Walk(terminal,
+         {{{ENTER, F2}, 60, 13, 6, OK_CANCEL},
+          {{ESC, F12, "root\tlaboratory" + ENTER}, 60, 19, 13, "<F2> Shut Down  <F11> Res"},
+          {{way}, 70, 10, 7, ""}});
+  }
 }
 
 TEST(Walk, ThroughTheDevicesOfTheDriverVM) {

@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "network/apply_changes_dialog.h"
+#include "network/error_text.h"
 
 namespace Tarnel {
 

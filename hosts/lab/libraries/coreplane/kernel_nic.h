@@ -8,7 +8,7 @@
 
 namespace Lab {
 
-// The kernel interface of that name; null when the state has none.
+// The kernel interface of that name; null for the empty name.
 std::unique_ptr<Nodeplane::Network::NetworkInterface> MakeKernelNic(const Json& state,
                                                                     const std::string& name);
 
