@@ -254,9 +254,15 @@ int RunShell(const char* command) {
   if (shell.status != 0) {
     return -1;
   }
-  while (waitpid(shell.pid, &status, 0) < 0 && errno == EINTR) {
+  for (;;) {
+    const pid_t changed = waitpid(shell.pid, &status, WUNTRACED);
+    if (changed > 0 && WIFSTOPPED(status)) {
+      // By the terminal's suspend character, with all that the shell had started.
+      kill(0, SIGCONT);
+    } else if (changed > 0 || errno != EINTR) {
+      return status;
+    }
   }
-  return status;
 }
 
 int32_t ReadFully(int fd, char* buffer, int32_t size) {

@@ -104,6 +104,12 @@ TEST(RunCommand, KillsWhatStops) {
   EXPECT_EQ(Logged(log), Lines({"user.err Run Command did not terminate normally"}));
 }
 
+TEST(RunShell, GoesOnAfterAStop) {
+  const int status = Tarnel::RunShell("kill -TSTP $$; exit 3");
+  EXPECT_TRUE(WIFEXITED(status));
+  EXPECT_EQ(WEXITSTATUS(status), 3);
+}
+
 TEST(RunCommand, AFailedStartGivesNothing) {
   const std::string before = OpenDescriptors();
   const Log log;
