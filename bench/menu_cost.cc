@@ -143,6 +143,7 @@ class Session : public Terminal {
 void PrintTimes(const char* what, const std::vector<KeyTime>& times) {
   const auto print = [&](const char* name, double KeyTime::*part) {
     std::vector<double> values;
+    values.reserve(times.size());
     for (const KeyTime& time : times) values.push_back(time.*part);
     std::sort(values.begin(), values.end());
     const auto at = [&](double rank) { return values[size_t(rank * double(values.size() - 1))]; };
@@ -160,7 +161,8 @@ std::vector<KeyTime> TimesOf(Session& session, const std::vector<std::string>& k
   return times;
 }
 
-std::vector<std::string> ThereAndBack(const char* there, const char* back, size_t steps) {
+std::vector<std::string> ThereAndBack(const std::string& there, const std::string& back,
+                                      size_t steps) {
   std::vector<std::string> keys(steps, there);
   keys.insert(keys.end(), steps, back);
   return keys;
@@ -194,7 +196,8 @@ void MeasureNetwork() {
   std::vector<KeyTime> applications;
   for (size_t visit = 0; visit < VISITS; ++visit) {
     openings.push_back(session.TimeOf(ENTER));
-    for (const std::string key : {DOWN, ENTER, visit % 2 == 0 ? "7" : "8", ENTER, "\x1b"}) {
+    const std::string digit = visit % 2 == 0 ? "7" : "8";
+    for (const std::string& key : {DOWN, ENTER, digit, ENTER, ESC}) {
       session.TimeOf(key);
     }
     session.Expect("<Y> Yes");
@@ -203,9 +206,9 @@ void MeasureNetwork() {
   }
   PrintTimes("opening", openings);
   PrintTimes("a VLAN, with all its steps", applications);
-  for (const std::string key : {ENTER, DOWN, ENTER}) session.TimeOf(key);
+  for (const std::string& key : {ENTER, DOWN, ENTER}) session.TimeOf(key);
   PrintTimes("VLAN form, typing", TimesOf(session, ThereAndBack("1", BACKSPACE, 4), COUNT));
-  for (const std::string key : {"\x1b", DOWN, DOWN, ENTER}) session.TimeOf(key);
+  for (const std::string& key : {ESC, DOWN, DOWN, ENTER}) session.TimeOf(key);
   PrintTimes("IPv6 form, Down and Up", TimesOf(session, {DOWN, UP}, COUNT));
 }
 
@@ -218,7 +221,7 @@ void MeasureTestSteps() {
   for (size_t visit = 0; visit < VISITS; ++visit) {
     const Log log;
     session.TimeOf(ENTER);
-    for (const std::string key : {DOWN, BACKSPACE, DOWN, DOWN, BACKSPACE}) session.TimeOf(key);
+    for (const std::string& key : {DOWN, BACKSPACE, DOWN, DOWN, BACKSPACE}) session.TimeOf(key);
     session.Type(ENTER);
     session.WaitFor("OK.");
     const double shown = double(std::chrono::duration_cast<std::chrono::microseconds>(

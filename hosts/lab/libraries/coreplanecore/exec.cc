@@ -24,6 +24,7 @@ std::vector<std::string> Words(const std::string& line) {
 
 std::vector<const char*> Vector(const std::vector<std::string>& words) {
   std::vector<const char*> vector;
+  vector.reserve(words.size() + 1);
   for (const std::string& word : words) vector.push_back(word.c_str());
   vector.push_back(nullptr);
   return vector;
@@ -43,6 +44,7 @@ int WaitForEnd(pid_t pid) {
 
 namespace Coreplane::Util {
 
+// NOLINTNEXTLINE(performance-unnecessary-value-param): as it is declared for callers.
 int Coreplane_Exec(std::string commandLine, bool keepOutput, bool ownGroup, bool keepEnvironment) {
   const std::vector<std::string> words = Words(commandLine);
   if (words.empty()) throw NodeplaneException("nothing to run");

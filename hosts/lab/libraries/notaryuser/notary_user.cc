@@ -28,7 +28,7 @@ int32_t InitError() {
 std::string Format(const char* format, va_list arguments) {
   char* text = nullptr;
   if (vasprintf(&text, format, arguments) < 0) return "";
-  const std::string message = text;
+  std::string message = text;
   free(text);
   return message;
 }

@@ -76,8 +76,9 @@ class Buffer {
   }
 
   char* TakeText(const char* text) {
-    char* const copy = Take<char>(strlen(text) + 1);
-    if (copy != nullptr) strcpy(copy, text);
+    const size_t size = strlen(text) + 1;
+    char* const copy = Take<char>(size);
+    if (copy != nullptr) memcpy(copy, text, size);
     return copy;
   }
 
