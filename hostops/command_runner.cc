@@ -205,8 +205,9 @@ class Child {
         err.ReadSome();
       }
       if (watched[4].revents != 0) {
+        // Which child it was is asked of the child.
         signalfd_siginfo change;
-        static_cast<void>(read(_changeDescriptor, &change, sizeof change));
+        [[maybe_unused]] const ssize_t taken = read(_changeDescriptor, &change, sizeof change);
       }
     }
     return _endDescriptor == -1 || watched[0].revents != 0 || watched[4].revents != 0;

@@ -52,8 +52,9 @@ class Frame : public Window {
   // Some inserted card carries this user id.
   static bool IsSmartCardPresent(const std::string& user);
 
-  // The only place where the process waits for the operator. Gives a key, or an Event. A null timeout waits for ever. With a signal mask there is no timeout: that
-  // mask holds while the process sleeps, and a signal that was handled then gives EVENT_NONE.
+  // The only place where the process waits for the operator. Gives a key, or an Event. A null
+  // timeout waits for ever. With a signal mask there is no timeout: that mask holds while the
+  // process sleeps, and a signal that was handled then gives EVENT_NONE.
   static int WaitEvent(timeval* timeout, const sigset_t* mask = nullptr);
   // Takes the terminal's new size into curses and logs it.
   static void HandleResize();
