@@ -122,8 +122,8 @@ void DriverVMDialog::AddRow(const PciDevice& device) {
 }
 
 int DriverVMDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   _list->SetItems(_items);
   _list->Repaint();
   SetFooter(HINT_DETAILS);

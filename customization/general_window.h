@@ -49,7 +49,6 @@ class GeneralWindow : public RootWindow {
   std::string NetworkText() const;
   std::string ConfiguredAddressText() const;
   std::string Ipv6Text() const;
-  std::string Text(int id) const { return _strings->GetString(id); }
 
   std::vector<std::string> _supportPages;
   size_t _supportPage = 0;

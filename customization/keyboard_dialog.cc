@@ -31,8 +31,8 @@ KeyboardDialog::KeyboardDialog(Frame* parent) : Dialog(parent, WIDTH, HEIGHT, HE
 }
 
 int KeyboardDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   _list->SetItems(_items);
   _list->Repaint();
   SetFooter(HINT_SELECT_TOGGLE);

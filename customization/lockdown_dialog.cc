@@ -36,14 +36,14 @@ bool RunAgentCommand(const char* command, std::string& complaint) {
 LockdownDialog::LockdownDialog(Frame* parent)
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT),
       _wasEnabled(QueryStewBool("stewsvc/auth/lockdown_is_enabled")),
-      _enableItem(_strings->GetString(TEXT_ENABLE), _wasEnabled, 0) {
+      _enableItem(Text(TEXT_ENABLE), _wasEnabled, 0) {
   _list = _content->Add<ItemList>(0, 0, _content->Width(), _content->Height());
   _list->SetItems({&_enableItem});
 }
 
 int LockdownDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   _list->Repaint();
   SetFooter(HINT_TOGGLE);
   for (;;) {

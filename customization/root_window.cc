@@ -37,7 +37,7 @@ RootWindow::RootWindow(Frame* parent)
 
 void RootWindow::ShowScreen() {
   Activate(true);
-  const std::string product = _strings->GetString(TEXT_PRODUCT);
+  const std::string product = Text(TEXT_PRODUCT);
   _statusLine->PutText(_statusLine->Width() / 2 - static_cast<int>(product.size()) / 2, 0, product);
   RefreshPanes();
   Refresh();

@@ -41,9 +41,9 @@ constexpr int TEXT_CHANGE_FAILED = 167;
 
 ChangePasswordDialog::ChangePasswordDialog(Frame* parent)
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT),
-      _oldItem(_strings->GetString(TEXT_OLD), "", FIELD_WIDTH),
-      _newItem(_strings->GetString(TEXT_NEW), "", FIELD_WIDTH),
-      _confirmItem(_strings->GetString(TEXT_CONFIRM), "", FIELD_WIDTH) {
+      _oldItem(Text(TEXT_OLD), "", FIELD_WIDTH),
+      _newItem(Text(TEXT_NEW), "", FIELD_WIDTH),
+      _confirmItem(Text(TEXT_CONFIRM), "", FIELD_WIDTH) {
   _list = _content->Add<ItemList>(0, 0, _content->Width(), _content->Height());
   for (InputItem* item : {&_oldItem, &_newItem, &_confirmItem}) {
     item->SetMasked(true);
@@ -55,8 +55,8 @@ ChangePasswordDialog::ChangePasswordDialog(Frame* parent)
 }
 
 int ChangePasswordDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_OK_CANCEL);
   _list->Repaint();
   SetCursorVisible(true);
@@ -173,8 +173,8 @@ void ChangePasswordDialog::ReportChange() {
 SamePasswordConfirmDialog::SamePasswordConfirmDialog(Frame* parent) : Dialog(parent, 70, 8, 5) {}
 
 int SamePasswordConfirmDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_WARNING));
-  SetBody(_strings->GetString(TEXT_SAME));
+  SetTitle(Text(TEXT_WARNING));
+  SetBody(Text(TEXT_SAME));
   SetFooter(HINT_CONFIRM);
   return IsAccepted(ENTER_KEY) ? 1 : 0;
 }

@@ -44,8 +44,8 @@ constexpr char HINT_PIN_MODE[] =
 LoginDialog::LoginDialog(Frame* parent)
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT),
       _keyboardNote("", true),
-      _loginItem(_strings->GetString(TEXT_LOGIN_NAME), DEFAULT_USER, FIELD_WIDTH),
-      _passwordItem(_strings->GetString(TEXT_PASSWORD), "", FIELD_WIDTH) {
+      _loginItem(Text(TEXT_LOGIN_NAME), DEFAULT_USER, FIELD_WIDTH),
+      _passwordItem(Text(TEXT_PASSWORD), "", FIELD_WIDTH) {
   _passwordItem.SetMasked(true);
   std::vector<Item*> items;
   if (!runningOverSerial) {
@@ -77,15 +77,15 @@ void LoginDialog::ShowKeyboardNote() {
 void LoginDialog::ShowMode(bool pin) {
   const std::string host = TextArea::GetHostnameValue() + ".";
   SetFooter(pin ? HINT_PIN_MODE : HINT_OK_CANCEL);
-  _loginItem.SetLabel(_strings->GetString(pin ? TEXT_LOGIN_ID : TEXT_LOGIN_NAME));
+  _loginItem.SetLabel(Text(pin ? TEXT_LOGIN_ID : TEXT_LOGIN_NAME));
   _loginItem.SetValue(pin ? _smartCardLoginId : DEFAULT_USER);
-  _passwordItem.SetLabel(_strings->GetString(pin ? TEXT_PIN : TEXT_PASSWORD));
+  _passwordItem.SetLabel(Text(pin ? TEXT_PIN : TEXT_PASSWORD));
   _passwordItem.SetValue("");
-  SetBody(_strings->GetString(pin ? TEXT_ENTER_PIN : TEXT_ENTER_PASSWORD) + host);
+  SetBody(Text(pin ? TEXT_ENTER_PIN : TEXT_ENTER_PASSWORD) + host);
 }
 
 int LoginDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
+  SetTitle(Text(TEXT_TITLE));
   ShowMode(_pinMode);
   SetCursorVisible(true);
   _list->SelectItem(LoginRow());

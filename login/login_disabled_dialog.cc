@@ -20,8 +20,8 @@ LoginDisabledDialog::LoginDisabledDialog(Frame* parent)
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT) {}
 
 int LoginDisabledDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY) + TextArea::GetHostnameValue() + ".");
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY) + TextArea::GetHostnameValue() + ".");
   SetFooter(HINT_OK);
   int key = 0;
   while (key != ENTER_KEY && key != ESC_KEY) {

@@ -137,9 +137,9 @@ void WelcomeWindow::BuildDefaultLayout() {
   DrawBox();
   _warningText = _bottomHalf->Add<TextArea>(16, 9, COLS - 32, 6, DARK_GREY);
   _footerText = _bottomHalf->Add<TextArea>(2, bottomHeight - 2, COLS - 4, 1, BLACK);
-  _footerText->SetText(std::string("<F2> {color:dark-grey}") + _strings->GetString(TEXT_CUSTOMIZE) +
-                       "{/color}{align:right}<F12> {color:dark-grey}" +
-                       _strings->GetString(TEXT_SHUT_DOWN) + "{/color}{/align}");
+  _footerText->SetText("<F2> {color:dark-grey}" + Text(TEXT_CUSTOMIZE) +
+                       "{/color}{align:right}<F12> {color:dark-grey}" + Text(TEXT_SHUT_DOWN) +
+                       "{/color}{/align}");
 }
 
 void WelcomeWindow::FillDefaultLayout() {
@@ -180,7 +180,7 @@ ManagementAddresses WelcomeWindow::ReadAddresses() {
   const Nodeplane::Network::IpConfig running = nic->GetRunningIpConfig();
   addresses.ipv6 = running.GetIpv6Network();
   addresses.ipv4 = running.GetIpv4Address();
-  _warningText->SetText(addresses.DhcpFailed() ? _strings->GetString(TEXT_DHCP_FAILED) : "");
+  _warningText->SetText(addresses.DhcpFailed() ? Text(TEXT_DHCP_FAILED) : "");
   return addresses;
 }
 
@@ -188,7 +188,7 @@ void WelcomeWindow::WarnInAuditMode() {
   SystemBootOptionRecord bootOption{};
   if (Sysnode_Get(SYSNODE_NODE_system_bootOption, &bootOption, sizeof bootOption) == 0 &&
       bootOption.auditMode == 1) {
-    _warningText->SetText(_strings->GetString(TEXT_AUDIT_MODE));
+    _warningText->SetText(Text(TEXT_AUDIT_MODE));
   }
 }
 
@@ -216,7 +216,7 @@ void WelcomeWindow::ShowAddresses(const std::string& addresses) {
 }
 
 void WelcomeWindow::ShowMachine() {
-  _productText->SetText(_strings->GetString(TEXT_PRODUCT));
+  _productText->SetText(Text(TEXT_PRODUCT));
   const Coreplane::Hardware::HardwareInfoImpl hardware;
   const std::string vendor = hardware.GetVendorName();
   _hostText->SetText(MachineName(vendor, hardware.GetProductName()));

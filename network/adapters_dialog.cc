@@ -73,8 +73,8 @@ int AdaptersDialog::Run() {
   if (!ReadNames() || !ScanVirtualSwitches() || !ScanLatticeSwitches()) {
     return 0;
   }
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_DETAILS);
   // The adapters are read one by one, which may take its time.
   Activate(true);
@@ -234,9 +234,9 @@ UsedAdaptersDialog::UsedAdaptersDialog(Frame* parent)
           _content->Add<TextArea>(0, 0, _content->Width(), _content->Height(), PARENT_COLOUR)) {}
 
 int UsedAdaptersDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_USED_TITLE));
-  SetBody(_strings->GetString(TEXT_USED_BODY));
-  _question->SetText(_strings->GetString(TEXT_USED_QUESTION));
+  SetTitle(Text(TEXT_USED_TITLE));
+  SetBody(Text(TEXT_USED_BODY));
+  _question->SetText(Text(TEXT_USED_QUESTION));
   SetFooter(HINT_OK_CANCEL);
   return IsAccepted(ENTER_KEY) ? 1 : 0;
 }

@@ -26,9 +26,9 @@ ApplyChangesDialog::ApplyChangesDialog(Frame* parent, bool rebootNeeded)
 }
 
 int ApplyChangesDialog::Run() {
-  _question->SetText(_strings->GetString(_rebootNeeded ? TEXT_REBOOT_QUESTION : TEXT_QUESTION));
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  _question->SetText(Text(_rebootNeeded ? TEXT_REBOOT_QUESTION : TEXT_QUESTION));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_YES_NO);
   for (;;) {
     switch (WaitKey(true)) {

@@ -59,22 +59,21 @@ DNSConfigurationDialog::DNSConfigurationDialog(Frame* parent, bool dhcpDns, bool
       _alternateDns(ParseAddress(AddressText(alternate))),
       _hostname(hostname),
       _list(_content->Add<ItemList>(0, 0, _content->Width(), _content->Height())),
-      _autoRadio(_strings->GetString(TEXT_AUTO), false),
-      _manualRadio(_strings->GetString(TEXT_MANUAL), false),
+      _autoRadio(Text(TEXT_AUTO), false),
+      _manualRadio(Text(TEXT_MANUAL), false),
       _blank("", false),
-      _primaryInput(_strings->GetString(TEXT_PRIMARY), AddressText(primary), DNS_FIELD_WIDTH),
-      _alternateInput(
-          _strings->GetString(IsMixedPair(primary, alternate) ? TEXT_IPV6_SERVER : TEXT_ALTERNATE),
-          AddressText(alternate), DNS_FIELD_WIDTH),
-      _hostnameInput(_strings->GetString(TEXT_HOSTNAME), hostname, DNS_FIELD_WIDTH) {
+      _primaryInput(Text(TEXT_PRIMARY), AddressText(primary), DNS_FIELD_WIDTH),
+      _alternateInput(Text(IsMixedPair(primary, alternate) ? TEXT_IPV6_SERVER : TEXT_ALTERNATE),
+                      AddressText(alternate), DNS_FIELD_WIDTH),
+      _hostnameInput(Text(TEXT_HOSTNAME), hostname, DNS_FIELD_WIDTH) {
   _autoRadio.SetEnabled(usingDhcp);
   _manualRadio.SetEnabled(usingDhcp);
   ShowMode();
 }
 
 int DNSConfigurationDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_DNS_TITLE));
-  SetBody(_strings->GetString(TEXT_DNS_BODY));
+  SetTitle(Text(TEXT_DNS_TITLE));
+  SetBody(Text(TEXT_DNS_BODY));
   SetFooter(HINT_MARK);
   _list->SetItems(
       {&_autoRadio, &_manualRadio, &_blank, &_primaryInput, &_alternateInput, &_hostnameInput});
@@ -140,7 +139,7 @@ void DNSConfigurationDialog::Edit(int key) {
   } else if (row == ALTERNATE_ROW && isAddressKey) {
     _alternateInput.HandleKey(key);
     if (_alternateInput.Value().size() <= SHORT_TEXT) {
-      _alternateInput.SetLabel(_strings->GetString(TEXT_ALTERNATE));
+      _alternateInput.SetLabel(Text(TEXT_ALTERNATE));
     }
   } else if (row == HOSTNAME_ROW && IsFieldKey(key, isalnum, "-.")) {
     _hostnameInput.HandleKey(key);
@@ -174,13 +173,13 @@ bool DNSConfigurationDialog::AreServersGood() {
 SuffixesDialog::SuffixesDialog(Frame* parent, const std::string& suffixes)
     : Dialog(parent, SUFFIXES_WIDTH, SUFFIXES_HEIGHT, SUFFIXES_HEADER_HEIGHT),
       _list(_content->Add<ItemList>(0, 0, _content->Width(), 1)),
-      _suffixesInput(_strings->GetString(TEXT_SUFFIXES), suffixes, SUFFIXES_FIELD_WIDTH) {
+      _suffixesInput(Text(TEXT_SUFFIXES), suffixes, SUFFIXES_FIELD_WIDTH) {
   _list->SetItems({&_suffixesInput});
 }
 
 int SuffixesDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_SUFFIXES_TITLE));
-  SetBody(_strings->GetString(TEXT_SUFFIXES_BODY));
+  SetTitle(Text(TEXT_SUFFIXES_TITLE));
+  SetBody(Text(TEXT_SUFFIXES_BODY));
   SetFooter(HINT_OK_CANCEL);
   SetCursorVisible(true);
   _list->Repaint();

@@ -55,22 +55,19 @@ IPConfigurationDialog::IPConfigurationDialog(Frame* parent, bool useNone, bool u
       _useDhcp(useDhcp),
       _useStatic(!useNone && !useDhcp),
       _list(_content->Add<ItemList>(0, 0, _content->Width(), _content->Height())),
-      _noneRadio(_strings->GetString(TEXT_NONE), false),
-      _dhcpRadio(_strings->GetString(TEXT_DHCP), false),
-      _staticRadio(_strings->GetString(TEXT_STATIC), false),
+      _noneRadio(Text(TEXT_NONE), false),
+      _dhcpRadio(Text(TEXT_DHCP), false),
+      _staticRadio(Text(TEXT_STATIC), false),
       _blank("", false),
-      _addressInput(_strings->GetString(TEXT_ADDRESS), config.GetIpv4Address().GetStringAddress(),
-                    FIELD_WIDTH),
-      _netmaskInput(_strings->GetString(TEXT_NETMASK), config.GetIpv4Netmask().GetStringAddress(),
-                    FIELD_WIDTH),
-      _gatewayInput(_strings->GetString(TEXT_GATEWAY), config.GetIpv4Gateway().GetStringAddress(),
-                    FIELD_WIDTH) {
+      _addressInput(Text(TEXT_ADDRESS), config.GetIpv4Address().GetStringAddress(), FIELD_WIDTH),
+      _netmaskInput(Text(TEXT_NETMASK), config.GetIpv4Netmask().GetStringAddress(), FIELD_WIDTH),
+      _gatewayInput(Text(TEXT_GATEWAY), config.GetIpv4Gateway().GetStringAddress(), FIELD_WIDTH) {
   ShowMode();
 }
 
 int IPConfigurationDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_MARK);
   _list->SetItems({&_noneRadio, &_dhcpRadio, &_staticRadio, &_blank, &_addressInput, &_netmaskInput,
                    &_gatewayInput});

@@ -67,15 +67,15 @@ IPv6ConfigurationDialog::IPv6ConfigurationDialog(Frame* parent, bool enabled, co
       _enabled(enabled),
       _config(working),
       _list(_content->Add<ItemList>(0, 0, _content->Width(), _content->Height())),
-      _disableRadio(_strings->GetString(TEXT_DISABLE), false),
-      _dynamicRadio(_strings->GetString(TEXT_DYNAMIC), false),
-      _dhcp6Check(_strings->GetString(TEXT_DHCP6), false, CHECK_INDENT),
-      _staticRadio(_strings->GetString(TEXT_STATIC), false),
+      _disableRadio(Text(TEXT_DISABLE), false),
+      _dynamicRadio(Text(TEXT_DYNAMIC), false),
+      _dhcp6Check(Text(TEXT_DHCP6), false, CHECK_INDENT),
+      _staticRadio(Text(TEXT_STATIC), false),
       _blank("", false),
       _addressInputs{{AddressLabel(*_strings, 1), "", FIELD_WIDTH},
                      {AddressLabel(*_strings, 2), "", FIELD_WIDTH},
                      {AddressLabel(*_strings, 3), "", FIELD_WIDTH}},
-      _gatewayInput(_strings->GetString(TEXT_GATEWAY), GatewayText(working), FIELD_WIDTH) {
+      _gatewayInput(Text(TEXT_GATEWAY), GatewayText(working), FIELD_WIDTH) {
   TakeAddresses();
   ShowMode(modes);
 }
@@ -94,8 +94,8 @@ void IPv6ConfigurationDialog::TakeAddresses() {
 }
 
 int IPv6ConfigurationDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_MARK);
   _list->SetItems({&_disableRadio, &_dynamicRadio, &_dhcp6Check, &_staticRadio, &_blank,
                    &_addressInputs[0], &_addressInputs[1], &_addressInputs[2], &_gatewayInput});

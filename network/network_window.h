@@ -62,7 +62,6 @@ class NetworkWindow : public RootWindow {
   std::string Ipv4Text() const;
   std::string Ipv6Text() const;
   std::string DnsText() const;
-  std::string Text(int id) const { return _strings->GetString(id); }
   // The text itself, or that it is not set.
   std::string OrNotSet(const std::string& text) const;
 

@@ -35,10 +35,10 @@ RestartNetworkDialog::RestartNetworkDialog(Frame* parent, NetworkInterface* nic)
       _text(_content->Add<TextArea>(0, 0, _content->Width(), _content->Height(), PARENT_COLOUR)) {}
 
 int RestartNetworkDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_CONFIRM_TITLE));
-  SetBody(_strings->GetString(TEXT_CONFIRM_BODY));
+  SetTitle(Text(TEXT_CONFIRM_TITLE));
+  SetBody(Text(TEXT_CONFIRM_BODY));
   SetFooter(HINT_F11_OK);
-  _text->SetText(_strings->GetString(TEXT_QUESTION));
+  _text->SetText(Text(TEXT_QUESTION));
   if (!IsAccepted(F11_KEY)) {
     return 0;
   }
@@ -56,8 +56,8 @@ int DoRestartNetworkDialog::Run() {
   const std::string name = _mgmtNic->GetName();
   syslog(LOG_INFO, "%s", ("Restarting " + name).c_str());
   PostEvent(NOTARY_NETWORK_RESTART, name.c_str());
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   Append(TEXT_STOPPING, " ");
   _mgmtNic->Disable();
   _mgmtNic->Refresh();
@@ -75,13 +75,12 @@ int DoRestartNetworkDialog::Run() {
 }
 
 void DoRestartNetworkDialog::Append(int textId, const char* end) {
-  _text->AppendText(std::string(_strings->GetString(textId)) + end);
+  _text->AppendText(Text(textId) + end);
 }
 
 void DoRestartNetworkDialog::ShowIpv4Address() {
   const std::string address = _mgmtNic->GetRunningIpConfig().GetIpv4Address().GetStringAddress();
-  _text->AppendText(std::string("\n") + INDENT + _strings->GetString(TEXT_ADDRESS) + " " + address +
-                    "\n");
+  _text->AppendText(std::string("\n") + INDENT + Text(TEXT_ADDRESS) + " " + address + "\n");
 }
 
 // Three lines at most: when they do not hold all, the last one says so.
@@ -99,8 +98,7 @@ void DoRestartNetworkDialog::ShowIpv6Addresses(bool usesDhcp) {
       break;
     }
     if (IsStaticGlobal(network)) {
-      lines += INDENT + std::string(_strings->GetString(TEXT_ADDRESS)) + " " +
-               network.GetStringAddress() + "\n";
+      lines += INDENT + Text(TEXT_ADDRESS) + " " + network.GetStringAddress() + "\n";
       ++shown;
     }
   }

@@ -54,8 +54,8 @@ RunTestDialog::~RunTestDialog() {
 }
 
 int RunTestDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   _stepDone = false;
   _current = this;
   SetFooter(HINT_CANCEL);
@@ -83,14 +83,14 @@ bool RunTestDialog::Ping(const IpAddress& target, int number) {
   const std::string address = target.GetStringAddress();
   const std::string interface = ManagementInterfaceName();
   const std::string scope = NeedsScope(target) && !interface.empty() ? "%" + interface : "";
-  _text->AppendText(std::string(_strings->GetString(TEXT_PINGING)) + " #" + std::to_string(number) +
-                    " (" + address + scope + ").");
+  _text->AppendText(Text(TEXT_PINGING) + " #" + std::to_string(number) + " (" + address + scope +
+                    ").");
   _childPid = StartPing(address, interface);
   return WaitForChild();
 }
 
 bool RunTestDialog::Resolve() {
-  _text->AppendText(std::string(_strings->GetString(TEXT_RESOLVING)) + " (" + _hostname + ").");
+  _text->AppendText(Text(TEXT_RESOLVING) + " (" + _hostname + ").");
   _childPid = StartResolve(_hostname);
   return WaitForChild();
 }
@@ -115,8 +115,7 @@ bool RunTestDialog::WaitForChild() {
 }
 
 void RunTestDialog::Report(int status) {
-  _text->AppendText(std::string("{align:right}") +
-                    _strings->GetString(status == 0 ? TEXT_OK : TEXT_FAILED) + "{/align}\n");
+  _text->AppendText("{align:right}" + Text(status == 0 ? TEXT_OK : TEXT_FAILED) + "{/align}\n");
   _stepDone = true;
   _childPid = -1;
 }

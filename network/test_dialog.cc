@@ -33,15 +33,14 @@ TestDialog::TestDialog(Frame* parent)
   candidates.resize(_addressInputs.size());
   std::vector<Item*> items;
   for (size_t i = 0; i < _addressInputs.size(); ++i) {
-    const std::string label =
-        std::string(_strings->GetString(TEXT_PING_ADDRESS)) + " #" + std::to_string(i) + ":";
+    const std::string label = Text(TEXT_PING_ADDRESS) + " #" + std::to_string(i) + ":";
     _addressInputs[i] = std::make_unique<InputItem>(label, candidates[i], FIELD_WIDTH);
     items.push_back(_addressInputs[i].get());
   }
   const std::string domain = _dnsConfig.GetDomain();
   _hostnameInput = std::make_unique<InputItem>(
-      _strings->GetString(TEXT_RESOLVE_HOSTNAME),
-      _dnsConfig.GetHostname() + (domain.empty() ? "" : "." + domain), FIELD_WIDTH);
+      Text(TEXT_RESOLVE_HOSTNAME), _dnsConfig.GetHostname() + (domain.empty() ? "" : "." + domain),
+      FIELD_WIDTH);
   items.push_back(_hostnameInput.get());
   _list = _content->Add<ItemList>(0, 0, _content->Width(), _content->Height());
   _list->SetItems(items);
@@ -62,8 +61,8 @@ std::vector<std::string> TestDialog::Candidates() const {
 }
 
 int TestDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_SELECT);
   SetCursorVisible(true);
   _list->Repaint();

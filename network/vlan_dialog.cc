@@ -35,7 +35,7 @@ std::string FieldText(uint16_t vlanId) { return vlanId == 0 ? "" : std::to_strin
 VlanDialog::VlanDialog(Frame* parent, uint16_t vlanId)
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT),
       _list(_content->Add<ItemList>(0, 0, _content->Width(), 1)),
-      _vlanInput(_strings->GetString(TEXT_LABEL), FieldText(vlanId), FIELD_WIDTH) {
+      _vlanInput(Text(TEXT_LABEL), FieldText(vlanId), FIELD_WIDTH) {
   _list->SetItems({&_vlanInput});
 }
 
@@ -44,8 +44,8 @@ uint16_t VlanDialog::GetVlanId() const {
 }
 
 int VlanDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_OK_CANCEL);
   SetCursorVisible(true);
   _list->Repaint();

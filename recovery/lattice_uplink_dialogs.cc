@@ -36,8 +36,8 @@ int UplinksDialog::Run() {
     syslog(LOG_ERR, "Unable to get Lattice");
     return 0;
   }
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   SetFooter(HINT_TOGGLE);
   Activate(true);
   Refresh();
@@ -96,9 +96,9 @@ UsedUplinksDialog::UsedUplinksDialog(Frame* parent)
           _content->Add<TextArea>(0, 0, _content->Width(), _content->Height(), PARENT_COLOUR)) {}
 
 int UsedUplinksDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_NONE_SELECTED_TITLE));
-  SetBody(_strings->GetString(TEXT_NONE_SELECTED));
-  _questionText->SetText(_strings->GetString(TEXT_CONTINUE));
+  SetTitle(Text(TEXT_NONE_SELECTED_TITLE));
+  SetBody(Text(TEXT_NONE_SELECTED));
+  _questionText->SetText(Text(TEXT_CONTINUE));
   SetFooter(HINT_OK_CANCEL);
   return IsAccepted(ENTER_KEY) ? 1 : 0;
 }
@@ -106,8 +106,8 @@ int UsedUplinksDialog::Run() {
 NoUplinksDialog::NoUplinksDialog(Frame* parent) : Dialog(parent, 60, 10, 5) {}
 
 int NoUplinksDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_NONE_TITLE));
-  SetBody(_strings->GetString(TEXT_NONE));
+  SetTitle(Text(TEXT_NONE_TITLE));
+  SetBody(Text(TEXT_NONE));
   SetFooter(HINT_OK);
   return IsAccepted(ENTER_KEY) ? 1 : 0;
 }

@@ -41,22 +41,21 @@ NetworkRestoreWindow::NetworkRestoreWindow(Frame* parent) : RootWindow(parent) {
 
 void NetworkRestoreWindow::AddRow(int id, bool selectable) {
   _rowIds.push_back(id);
-  _items.push_back(std::make_unique<LabelItem>(_strings->GetString(id), selectable));
+  _items.push_back(std::make_unique<LabelItem>(Text(id), selectable));
 }
 
 void NetworkRestoreWindow::GreyRow(int id) {
   for (size_t row = 0; row < _rowIds.size(); ++row) {
     if (_rowIds[row] == id) {
       _items[row]->SetSelectable(false);
-      _items[row]->SetLabel(std::string("{color:dark-grey}") + _strings->GetString(id) +
-                            "{/color}");
+      _items[row]->SetLabel("{color:dark-grey}" + Text(id) + "{/color}");
     }
   }
 }
 
 int NetworkRestoreWindow::Run() {
   ShowScreen();
-  SetLeftTitle(_strings->GetString(TEXT_TITLE));
+  SetLeftTitle(Text(TEXT_TITLE));
   for (;;) {
     switch (WaitKey(true)) {
       case ESC_KEY:
@@ -89,8 +88,8 @@ void NetworkRestoreWindow::RefreshPanes() {
 void NetworkRestoreWindow::ShowRightPane() {
   const int row = FocusedRow();
   _rightText->SetText("");
-  SetRightTitle(_strings->GetString(row));
-  _rightText->SetText(_strings->GetString(ExplanationOf(row)));
+  SetRightTitle(Text(row));
+  _rightText->SetText(Text(ExplanationOf(row)));
   SetRightHint(row == ROW_SETTINGS ? HINT_RESTART_OR_LOG_OUT : HINT_RESTORE);
 }
 

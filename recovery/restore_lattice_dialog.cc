@@ -76,10 +76,10 @@ RestoreLatticeDialog::Present RestoreLatticeDialog::ReadPresent() {
 void RestoreLatticeDialog::AddRows(const Present& present) {
   _items.push_back(std::make_unique<LabelItem>("Management Interface - " + present.nicName, false));
   _items.push_back(std::make_unique<LabelItem>("Current LatticePort - " + present.portKey, false));
-  auto unblock = std::make_unique<CheckItem>(_strings->GetString(TEXT_UNBLOCK), false, 0);
-  auto uplinks = std::make_unique<LabelItem>(_strings->GetString(TEXT_UPLINKS), true);
-  auto vlan = std::make_unique<InputItem>(_strings->GetString(TEXT_VLAN),
-                                          std::to_string(present.vlanId), VLAN_FIELD_WIDTH);
+  auto unblock = std::make_unique<CheckItem>(Text(TEXT_UNBLOCK), false, 0);
+  auto uplinks = std::make_unique<LabelItem>(Text(TEXT_UPLINKS), true);
+  auto vlan = std::make_unique<InputItem>(Text(TEXT_VLAN), std::to_string(present.vlanId),
+                                          VLAN_FIELD_WIDTH);
   _unblockItem = unblock.get();
   _vlanItem = vlan.get();
   _items.push_back(std::move(unblock));
@@ -88,8 +88,8 @@ void RestoreLatticeDialog::AddRows(const Present& present) {
 }
 
 int RestoreLatticeDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
   _list->SetItems(_items);
   _list->Repaint();
   SetFooter(HINT_F11_OK);

@@ -52,10 +52,10 @@ int RestoreNetworkDialog::Run() {
 }
 
 bool RestoreNetworkDialog::IsConfirmed() {
-  SetTitle(_strings->GetString(TEXT_ASK_TITLE));
-  SetBody(_strings->GetString(TEXT_ASK_BODY));
+  SetTitle(Text(TEXT_ASK_TITLE));
+  SetBody(Text(TEXT_ASK_BODY));
   SetFooter(HINT_F11_RESET);
-  _questionText->SetText(_strings->GetString(TEXT_ASK));
+  _questionText->SetText(Text(TEXT_ASK));
   return IsAccepted(F11_KEY);
 }
 
@@ -65,8 +65,8 @@ DoRestoreNetworkDialog::DoRestoreNetworkDialog(Frame* parent)
           _content->Add<TextArea>(0, 0, _content->Width(), _content->Height(), PARENT_COLOUR)) {}
 
 int DoRestoreNetworkDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_RESTORE_TITLE));
-  SetBody(_strings->GetString(TEXT_RESTORE_BODY));
+  SetTitle(Text(TEXT_RESTORE_TITLE));
+  SetBody(Text(TEXT_RESTORE_BODY));
   bool machinesAreOff = true;
   if (Coreplane::Resource::ResourceInfoImpl().HasRunningVirtualMachines()) {
     if (RunningVMsWarningDialog(this).Exec() == 0) {
@@ -81,19 +81,19 @@ int DoRestoreNetworkDialog::Run() {
 }
 
 bool DoRestoreNetworkDialog::PowerOffVms() {
-  _progressText->AppendText(_strings->GetString(TEXT_POWERING_OFF) + std::string(" "));
+  _progressText->AppendText(Text(TEXT_POWERING_OFF) + " ");
   const char* argv[] = {"powerOffVms", nullptr};
   const bool done =
       RunCommand("/sbin/powerOffVms", argv, nullptr, nullptr, nullptr, nullptr, nullptr, 0, 0) == 0;
   if (done) {
-    _progressText->AppendText(_strings->GetString(TEXT_DONE) + std::string("\n"));
+    _progressText->AppendText(Text(TEXT_DONE) + "\n");
   }
   return done;
 }
 
 // The dump service goes off in any case; the network stays as it is while machines may run.
 void DoRestoreNetworkDialog::RestoreNetwork(bool machinesAreOff) {
-  const std::string failed = _strings->GetString(TEXT_FAILED) + std::string("\n");
+  const std::string failed = Text(TEXT_FAILED) + "\n";
   try {
     Coreplane::Network::NetworkInfoImpl network;
     network.DisableNetDumper();
@@ -102,12 +102,12 @@ void DoRestoreNetworkDialog::RestoreNetwork(bool machinesAreOff) {
       syslog(LOG_ERR, "Error powering off VMs");
       return;
     }
-    _progressText->AppendText(_strings->GetString(TEXT_CONFIGURING) + std::string(" "));
+    _progressText->AppendText(Text(TEXT_CONFIGURING) + " ");
     syslog(LOG_INFO, "Clearing Network Config");
     network.ClearNetworkConfig();
     syslog(LOG_INFO, "Auto-Configuring Network");
     network.AutoConfigNetwork();
-    _progressText->AppendText(_strings->GetString(TEXT_DONE) + std::string("\n"));
+    _progressText->AppendText(Text(TEXT_DONE) + "\n");
   } catch (const Nodeplane::Lib::NodeplaneException&) {
     _progressText->AppendText(failed);
     syslog(LOG_ERR, "Error auto-configuring network");

@@ -87,9 +87,9 @@ SafeModeNetworkDialog::SafeModeNetworkDialog(Frame* parent)
           _content->Add<TextArea>(0, 0, _content->Width(), _content->Height(), PARENT_COLOUR)) {}
 
 int SafeModeNetworkDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_BODY));
-  _questionText->SetText(_strings->GetString(TEXT_QUESTION));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_BODY));
+  _questionText->SetText(Text(TEXT_QUESTION));
   SetFooter(HINT_F11_OK);
   if (!IsAccepted(F11_KEY)) {
     return 0;

@@ -75,6 +75,9 @@ class Frame : public Window {
   // pulled.
   static void PollSmartCard();
 
+  // A text of the catalogue.
+  std::string Text(int id) const { return _strings->GetString(id); }
+
   Frame* _parentFrame;
   StringFactory* _strings;
 

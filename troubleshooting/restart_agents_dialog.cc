@@ -57,15 +57,15 @@ bool StartLiveCoreThread() {
 RestartAgentsDialog::RestartAgentsDialog(Frame* parent)
     : Dialog(parent, 71, 20, 9),
       _progressText(_content->Add<TextArea>(1, 2, Width() - 8, 3, PARENT_COLOUR)),
-      _collectItem(_strings->GetString(TEXT_COLLECT), false, 0),
+      _collectItem(Text(TEXT_COLLECT), false, 0),
       _list(_content->Add<ItemList>(0, 0, Width() - 4, 1)),
       _finishedSteps("{color:dark-grey}") {}
 
 int RestartAgentsDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TITLE));
-  SetBody(_strings->GetString(TEXT_WARNING));
+  SetTitle(Text(TEXT_TITLE));
+  SetBody(Text(TEXT_WARNING));
   SetFooter(HINT_F11_OK);
-  _progressText->SetText(_strings->GetString(TEXT_QUESTION));
+  _progressText->SetText(Text(TEXT_QUESTION));
   _list->SetItems({&_collectItem});
   _list->Repaint();
   if (!IsConfirmed()) {
@@ -106,15 +106,14 @@ void RestartAgentsDialog::Restart() {
 }
 
 void RestartAgentsDialog::RunStep(int text, const char* command) {
-  _progressText->SetText(_finishedSteps + "{color:black}" + _strings->GetString(text));
+  _progressText->SetText(_finishedSteps + "{color:black}" + Text(text));
   UpdateScreen();
   Execute(command);
   FinishStep(text);
 }
 
 void RestartAgentsDialog::FinishStep(int text) {
-  _finishedSteps +=
-      std::string(_strings->GetString(text)) + " " + _strings->GetString(TEXT_DONE) + "\n";
+  _finishedSteps += Text(text) + " " + Text(TEXT_DONE) + "\n";
   _progressText->SetText(_finishedSteps);
 }
 

@@ -94,16 +94,15 @@ ShellTimeoutDialog::ShellTimeoutDialog(Frame* parent)
     : Dialog(parent, 70, 21, 15),
       _availabilityMinutes(ReadMinutes(AVAILABILITY_OPTION)),
       _idleMinutes(ReadMinutes(IDLE_OPTION)),
-      _availabilityItem(_strings->GetString(TEXT_AVAILABILITY),
-                        std::to_string(_availabilityMinutes), FIELD_WIDTH),
-      _idleItem(_strings->GetString(TEXT_IDLE), std::to_string(_idleMinutes), FIELD_WIDTH) {
+      _availabilityItem(Text(TEXT_AVAILABILITY), std::to_string(_availabilityMinutes), FIELD_WIDTH),
+      _idleItem(Text(TEXT_IDLE), std::to_string(_idleMinutes), FIELD_WIDTH) {
   _list = _content->Add<ItemList>(0, 0, _content->Width(), 2);
   _list->SetItems({&_availabilityItem, &_idleItem});
 }
 
 int ShellTimeoutDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_SHELL_TITLE));
-  SetBody(_strings->GetString(TEXT_SHELL_BODY));
+  SetTitle(Text(TEXT_SHELL_TITLE));
+  SetBody(Text(TEXT_SHELL_BODY));
   SetFooter(HINT_OK_CANCEL);
   SetCursorVisible(true);
   _list->Repaint();
@@ -167,15 +166,15 @@ void ShellTimeoutDialog::ApplyIdle() {
 TarnelTimeoutDialog::TarnelTimeoutDialog(Frame* parent)
     : Dialog(parent, 70, 15, 9),
       _oldSeconds(GetTarnelTimeoutValue()),
-      _timeoutItem(_strings->GetString(TEXT_TARNEL),
-                   std::to_string(_oldSeconds / SECONDS_PER_MINUTE), FIELD_WIDTH) {
+      _timeoutItem(Text(TEXT_TARNEL), std::to_string(_oldSeconds / SECONDS_PER_MINUTE),
+                   FIELD_WIDTH) {
   _list = _content->Add<ItemList>(0, 0, _content->Width(), 2);
   _list->SetItems({&_timeoutItem});
 }
 
 int TarnelTimeoutDialog::Run() {
-  SetTitle(_strings->GetString(TEXT_TARNEL_TITLE));
-  SetBody(_strings->GetString(TEXT_TARNEL_BODY));
+  SetTitle(Text(TEXT_TARNEL_TITLE));
+  SetBody(Text(TEXT_TARNEL_BODY));
   SetFooter(HINT_OK_CANCEL);
   SetCursorVisible(true);
   _list->Repaint();

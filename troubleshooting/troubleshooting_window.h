@@ -41,7 +41,6 @@ class TroubleShootingWindow : public RootWindow {
 
   void ShowRightPane();
   std::string RightText(int row) const;
-  std::string Text(int id) const { return _strings->GetString(id); }
 
   std::vector<std::unique_ptr<LabelItem>> _items;
   bool _shellEnabled;

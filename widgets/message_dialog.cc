@@ -20,7 +20,7 @@ MessageDialog::MessageDialog(Frame* parent, int titleId, const std::string& body
     : Dialog(parent, WIDTH, HEIGHT, HEADER_HEIGHT), _titleId(titleId), _body(body) {}
 
 int MessageDialog::Run() {
-  SetTitle(_strings->GetString(_titleId));
+  SetTitle(Text(_titleId));
   SetBody(_body);
   SetFooter(HINT_OK);
   WaitForEnter();
