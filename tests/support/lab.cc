@@ -50,6 +50,20 @@ LogLine ParseLogLine(const std::string& line) {
   return parsed;
 }
 
+constexpr char MARK[] = "end of what was logged, ";
+
+// Waits until all that was logged so far has arrived: lines arrive in their order.
+void WaitForLog() {
+  static int count = 0;
+  const std::string mark = MARK + std::to_string(++count);
+  syslog(LOG_USER | LOG_DEBUG, "%s", mark.c_str());
+  EXPECT_TRUE(WaitUntil([&] { return ReadFile(LOG_FILE).find(mark + "\n") != std::string::npos; }));
+}
+
+bool Has(const std::vector<LogLine>& lines, const LogLine& line) {
+  return std::find(lines.begin(), lines.end(), line) != lines.end();
+}
+
 }  // namespace
 
 void LoadScenario(const std::string& name, const std::string& patch) {
@@ -92,38 +106,40 @@ void WriteFile(const std::string& path, const std::string& content) {
   std::ofstream(path, std::ios::binary | std::ios::trunc) << content;
 }
 
-Log::Log() : _start(ReadFile(LOG_FILE).size()) {}
+Log::Log() {
+  WaitForLog();
+  _start = ReadFile(LOG_FILE).size();
+}
 
-std::vector<LogLine> Log::Lines() const {
+std::vector<LogLine> Log::Arrived() const {
   const std::string log = ReadFile(LOG_FILE);
   std::vector<LogLine> lines;
-  for (const std::string& line : SplitLines(log.substr(std::min(_start, log.size())))) {
-    lines.push_back(ParseLogLine(line));
+  for (const std::string& text : SplitLines(log.substr(std::min(_start, log.size())))) {
+    if (text.find(MARK) == std::string::npos) {
+      lines.push_back(ParseLogLine(text));
+    }
   }
   return lines;
 }
 
-bool Log::Contains(const LogLine& line) const {
-  const std::vector<LogLine> lines = Lines();
-  return std::find(lines.begin(), lines.end(), line) != lines.end();
+std::vector<LogLine> Log::Lines() const {
+  WaitForLog();
+  return Arrived();
 }
 
+bool Log::Contains(const LogLine& line) const { return Has(Lines(), line); }
+
 void Log::WaitFor(const LogLine& line) const {
-  EXPECT_TRUE(WaitUntil([&] { return Contains(line); }))
+  EXPECT_TRUE(WaitUntil([&] { return Has(Arrived(), line); }))
       << "No log line \"" << line.level << " " << line.text << "\" behind\n"
       << LastLogLines(15);
 }
 
 std::vector<std::string> Logged(const Log& log) {
-  // Lines of one process arrive in their order, so behind this one there is nothing to wait for.
-  static int mark = 0;
   const std::string own = std::string(program_invocation_short_name) + ": ";
-  const std::string last = "end of case " + std::to_string(++mark);
-  syslog(LOG_DEBUG, "%s", last.c_str());
-  log.WaitFor({"user.debug", own + last});
   std::vector<std::string> lines;
   for (const LogLine& line : log.Lines()) {
-    if (line.text.rfind(own, 0) == 0 && line.level != "user.debug") {
+    if (line.text.rfind(own, 0) == 0) {
       lines.push_back(line.level + " " + line.text.substr(own.size()));
     }
   }

@@ -35,12 +35,15 @@ class Log {
  public:
   Log();
 
+  // Both know all that was logged before the call.
   std::vector<LogLine> Lines() const;
+  bool Contains(const LogLine& line) const;
   // Waits for a line; one that does not come is a test failure.
   void WaitFor(const LogLine& line) const;
-  bool Contains(const LogLine& line) const;
 
  private:
+  std::vector<LogLine> Arrived() const;
+
   size_t _start;
 };
 
