@@ -81,6 +81,18 @@ bool IsSet(const NicTeamingPolicy& policy, NicTeamingPolicy::FieldMask field) {
   return (policy.GetFieldMask() & field) != 0;
 }
 
+// Allows that many more active uplinks where their number is limited. Gives whether it is. A limit
+// at the end of its range stays there.
+bool RaiseMaximum(NicTeamingPolicy& policy, int change) {
+  if (!IsSet(policy, NicTeamingPolicy::MAX_ACTIVE_UPLINKS)) {
+    return false;
+  }
+  const int64_t maximum = int64_t{policy.GetMaxActiveUplinks()} + change;
+  policy.SetMaxActiveUplinks(
+      static_cast<int32_t>(std::clamp<int64_t>(maximum, INT32_MIN, INT32_MAX)));
+  return true;
+}
+
 template <class Handle>
 bool NameOf(const Handle& portset, std::string& name) {
   if (portset == nullptr) {
@@ -194,9 +206,7 @@ bool RemoveUplinkFromPolicy(const std::string& name, PortGroup& group) {
       if (place != order.end()) {
         order.erase(place);
         policy.SetUplinkOrder(order);
-        if (IsSet(policy, NicTeamingPolicy::MAX_ACTIVE_UPLINKS)) {
-          policy.SetMaxActiveUplinks(policy.GetMaxActiveUplinks() - 1);
-        }
+        RaiseMaximum(policy, -1);
       }
     }
     group.SetTeamingPolicy(policy);
@@ -214,15 +224,11 @@ bool AddUplinkToPolicy(const std::string& name, PortGroup& group) {
 }
 
 bool AppendUplink(const std::string& name, NicTeamingPolicy& policy) {
-  bool changed = false;
   std::vector<std::string> order;
   if (IsSet(policy, NicTeamingPolicy::UPLINK_ORDER)) {
     order = policy.GetUplinkOrder();
   }
-  if (IsSet(policy, NicTeamingPolicy::MAX_ACTIVE_UPLINKS)) {
-    policy.SetMaxActiveUplinks(policy.GetMaxActiveUplinks() + 1);
-    changed = true;
-  }
+  bool changed = RaiseMaximum(policy, 1);
   if (std::find(order.begin(), order.end(), name) == order.end()) {
     order.push_back(name);
     policy.SetUplinkOrder(order);

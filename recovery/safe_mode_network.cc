@@ -45,14 +45,17 @@ std::vector<std::string> ReadUplinks(const NetworkInterface& nic) {
   return portset->GetUplinks();
 }
 
-// The prefix with the lowest number for which the host has nothing of that name.
+// The prefix with the lowest number for which the host has nothing of that name. No host has as
+// many as are tried.
 std::string FindFreeName(const std::string& prefix, bool (*isTaken)(const std::string& name)) {
-  for (int number = 0;; ++number) {
+  constexpr int MOST = 10000;
+  for (int number = 0; number < MOST; ++number) {
     std::string name = prefix + std::to_string(number);
     if (!isTaken(name)) {
       return name;
     }
   }
+  throw NodeplaneException("The host says that every name is taken");
 }
 
 std::unique_ptr<PortGroup> MakePortGroupOnNewSwitch() {

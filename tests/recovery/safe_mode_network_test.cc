@@ -68,6 +68,8 @@ const FailedStep FAILED_STEPS[] = {
     {"ConnectionPoint::GetPortset", TOLD, "................", MOVE_FAILED},
     {"Portset::GetUplinks", TOLD, "................", MOVE_FAILED},
     {"PortsetImpl::IsValidVirtualSwitch", TOLD, "................", MOVE_FAILED},
+    {"PortsetImpl::IsValidVirtualSwitch", R"("returns": true)", "................",
+     "Changing to legacy virtual switch failed: The host says that every name is taken"},
     {"VirtualSwitchInfoImpl::AddVirtualSwitch", TOLD, "X...............", MOVE_FAILED},
     {"PortGroupImpl::IsValidPortGroup", TOLD, "X...............", MOVE_FAILED},
     {"VirtualSwitch::AddPortGroup", TOLD, "XX..............", MOVE_FAILED},
@@ -163,6 +165,10 @@ TEST(AddUplinkToNewPolicy, ChangesWhatThePolicyHas) {
     EXPECT_EQ(policy.GetUplinkOrder(), row.newOrder);
     EXPECT_EQ(policy.GetMaxActiveUplinks(), row.newMaximum);
   }
+  NicTeamingPolicy policy;
+  policy.SetMaxActiveUplinks(INT32_MAX);
+  AddUplinkToNewPolicy("b", policy);
+  EXPECT_EQ(policy.GetMaxActiveUplinks(), INT32_MAX);
 }
 
 }  // namespace
