@@ -29,7 +29,7 @@ constexpr char HEADING[] =
     "    {align:padding:13}PCI Device{/align}{align:padding:28}Vendor{/align}"
     "{align:padding:30}Device{/align}";
 
-// Base classes of the PCI specification.
+// Base classes, as PCI numbers them.
 constexpr int MASS_STORAGE = 1;
 constexpr int NETWORK = 2;
 

@@ -36,7 +36,7 @@ class PciDevice {
   virtual std::string GetAddress() const = 0;
   virtual std::string GetVendorName() const = 0;
   virtual std::string GetDeviceName() const = 0;
-  // Base class in the high byte, sub-class in the low one, as in the PCI specification.
+  // Base class in the high byte, sub-class in the low one, as PCI numbers them.
   virtual uint16_t GetDeviceClass() const = 0;
   // A virtual machine can drive it.
   virtual bool IsPassthruCapable() const = 0;
