@@ -441,6 +441,22 @@ TEST(ApplyChanges, TellWhenTheMacAddressCannotBeTaken) {
   EXPECT_EQ(TraceLines().back(), REFRESH);
 }
 
+TEST(ApplyChanges, ShowInThePaneBeforeTheSlowerSteps) {
+  LoadScenario("network-dhcp", R"({
+      "network": {"kernelNics": {"core0": {"stored": {"ipv6Dhcp": false}}}},
+      "faults": [{"operation": "RoutingInfoImpl::SetCorelinDefaultGateway", "delayMs": 1000}]})");
+  NetworkScreen screen;
+  screen.Edit(2, Down(2) + " " + Down(1) + "192.0.2.30" + Down(1) + "255.255.255.0" + Down(1) +
+                     "192.0.2.1");
+  screen.Press({DOWN, DOWN});
+  EXPECT_EQ(screen.RightPane(4), "Automatic");
+  const Log log;
+  screen.Apply();
+  screen.WaitUntil([&] { return screen.RightPane(4) == "Manual"; }, "the new mode");
+  EXPECT_FALSE(log.Contains({"user.info", "TARNEL: Setting suffixes to example.com"}));
+  screen.WaitFor("System Customization");
+}
+
 TEST(ApplyChanges, ShowOnTheWelcomeScreen) {
   LoadScenario("sample");
   NetworkScreen screen;

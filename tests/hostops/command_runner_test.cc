@@ -96,7 +96,7 @@ TEST(RunCommand, KillsWhatStops) {
   sigaddset(&childSignal, SIGCHLD);
   pthread_sigmask(SIG_BLOCK, &childSignal, nullptr);
   const Log log;
-  const CommandResult result = RunShell("echo begun; kill -TSTP $$; echo ended");
+  const CommandResult result = RunShell("echo begun; kill -TSTP $$; echo ended", 255, 10);
   pthread_sigmask(SIG_UNBLOCK, &childSignal, nullptr);
   EXPECT_EQ(result.code, -1);
   EXPECT_EQ(result.out, "begun\n");
