@@ -2,7 +2,7 @@
 #include <spawn.h>
 #include <sys/wait.h>
 
-#include "hostops/command_runner.h"
+#include "console/hostops/command_runner.h"
 
 namespace {
 

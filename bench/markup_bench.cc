@@ -4,9 +4,9 @@
 #include <cstdio>
 #include <string>
 
-#include "shell/colours.h"
-#include "widgets/markup_layout.h"
-#include "widgets/text_area.h"
+#include "console/screen/colours.h"
+#include "console/widgets/markup_layout.h"
+#include "console/widgets/text_area.h"
 
 namespace {
 

@@ -15,7 +15,7 @@
 #include <thread>
 #include <vector>
 
-#include "shell/colours.h"
+#include "console/screen/colours.h"
 #include "tests/support/curses_screen.h"
 #include "tests/support/lab.h"
 #include "tests/support/terminal.h"

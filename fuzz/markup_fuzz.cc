@@ -7,10 +7,10 @@
 #include <cctype>
 #include <ctime>
 
+#include "console/screen/colours.h"
+#include "console/widgets/markup_layout.h"
+#include "console/widgets/text_area.h"
 #include "fuzz/random.h"
-#include "shell/colours.h"
-#include "widgets/markup_layout.h"
-#include "widgets/text_area.h"
 
 namespace {
 

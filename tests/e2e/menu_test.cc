@@ -5,7 +5,7 @@
 #include <csignal>
 #include <cstring>
 
-#include "shell/colours.h"
+#include "console/screen/colours.h"
 #include "tests/support/lab.h"
 #include "tests/support/operator.h"
 

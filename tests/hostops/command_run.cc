@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <chrono>
 
-#include "hostops/command_runner.h"
+#include "console/hostops/command_runner.h"
 
 namespace Tarnel::Testing {
 

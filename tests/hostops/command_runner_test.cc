@@ -1,4 +1,4 @@
-#include "hostops/command_runner.h"
+#include "console/hostops/command_runner.h"
 
 #include <fcntl.h>
 #include <gtest/gtest.h>

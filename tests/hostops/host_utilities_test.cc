@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
+#include "console/hostops/command_runner.h"
 #include "hostapi/nodeplane/exception.h"
-#include "hostops/command_runner.h"
 #include "tests/support/lab.h"
 
 namespace Tarnel::Testing {

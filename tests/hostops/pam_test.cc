@@ -1,8 +1,8 @@
-#include "hostops/pam.h"
+#include "console/hostops/pam.h"
 
 #include <gtest/gtest.h>
 
-#include "hostops/command_runner.h"
+#include "console/hostops/command_runner.h"
 #include "tests/support/lab.h"
 
 namespace Tarnel::Testing {

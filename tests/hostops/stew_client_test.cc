@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
-#include "hostops/command_runner.h"
-#include "shell/frame.h"
+#include "console/hostops/command_runner.h"
+#include "console/screen/frame.h"
 #include "tests/hostops/command_run.h"
 
 namespace Tarnel::Testing {

@@ -1,4 +1,4 @@
-#include "login/host_summary.h"
+#include "console/login/host_summary.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "network/adapter_row.h"
+#include "console/network/adapter_row.h"
 
 #include <gtest/gtest.h>
 

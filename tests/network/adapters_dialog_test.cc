@@ -1,4 +1,4 @@
-#include "network/adapters_dialog.h"
+#include "console/network/adapters_dialog.h"
 
 #include <syslog.h>
 

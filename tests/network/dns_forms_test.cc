@@ -1,4 +1,4 @@
-#include "network/dns_dialogs.h"
+#include "console/network/dns_dialogs.h"
 
 #include "tests/network/form_player.h"
 

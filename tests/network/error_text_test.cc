@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "network/error_text.h"
+#include "console/network/error_text.h"
 
 namespace Tarnel {
 

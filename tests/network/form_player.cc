@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "shell/colours.h"
+#include "console/screen/colours.h"
 
 namespace Tarnel::Testing {
 

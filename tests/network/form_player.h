@@ -5,7 +5,7 @@
 #include <functional>
 #include <string>
 
-#include "shell/frame.h"
+#include "console/screen/frame.h"
 #include "tests/support/curses_screen.h"
 #include "tests/support/fake_time.h"
 #include "tests/support/keys.h"

@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "network/ip_configuration_dialog.h"
-#include "network/ipv6_configuration_dialog.h"
-#include "network/vlan_dialog.h"
+#include "console/network/ip_configuration_dialog.h"
+#include "console/network/ipv6_configuration_dialog.h"
+#include "console/network/vlan_dialog.h"
 #include "tests/network/form_player.h"
 
 namespace Tarnel::Testing {

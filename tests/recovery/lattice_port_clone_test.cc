@@ -1,12 +1,12 @@
-#include "recovery/lattice_port_clone.h"
+#include "console/recovery/lattice_port_clone.h"
 
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <utility>
 
+#include "console/hostops/command_runner.h"
 #include "hostapi/nodeplane/exception.h"
-#include "hostops/command_runner.h"
 #include "tests/support/lab.h"
 
 namespace Tarnel {

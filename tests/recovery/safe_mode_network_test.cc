@@ -1,4 +1,4 @@
-#include "recovery/safe_mode_network.h"
+#include "console/recovery/safe_mode_network.h"
 
 #include <gtest/gtest.h>
 

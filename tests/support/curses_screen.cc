@@ -17,8 +17,8 @@
 #include <string_view>
 #include <thread>
 
-#include "shell/colours.h"
-#include "shell/key_map.h"
+#include "console/screen/colours.h"
+#include "console/screen/key_map.h"
 #include "tests/support/descriptor.h"
 #include "tests/support/wait.h"
 

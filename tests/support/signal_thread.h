@@ -1,6 +1,6 @@
 #pragma once
 
-#include "shell/frame.h"
+#include "console/screen/frame.h"
 
 namespace Tarnel::Testing {
 

@@ -1,12 +1,12 @@
-#include "widgets/host_facts.h"
+#include "console/widgets/host_facts.h"
 
 #include <gtest/gtest.h>
 #include <syslog.h>
 
 #include <filesystem>
 
+#include "console/screen/screen.h"
 #include "hostapi/nodeplane/exception.h"
-#include "shell/screen.h"
 #include "tests/support/curses_screen.h"
 #include "tests/support/lab.h"
 #include "tests/widgets/pane.h"

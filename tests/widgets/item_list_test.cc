@@ -1,4 +1,4 @@
-#include "widgets/item_list.h"
+#include "console/widgets/item_list.h"
 
 #include <curses.h>
 #include <gtest/gtest.h>
@@ -7,9 +7,9 @@
 #include <memory>
 #include <vector>
 
-#include "shell/screen.h"
+#include "console/screen/screen.h"
+#include "console/widgets/input_item.h"
 #include "tests/support/curses_screen.h"
-#include "widgets/input_item.h"
 
 namespace Tarnel::Testing {
 namespace {

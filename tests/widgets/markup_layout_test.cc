@@ -1,4 +1,4 @@
-#include "widgets/markup_layout.h"
+#include "console/widgets/markup_layout.h"
 
 #include <gtest/gtest.h>
 

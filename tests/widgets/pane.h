@@ -1,8 +1,8 @@
 #pragma once
 
-#include "shell/colours.h"
-#include "shell/window.h"
-#include "widgets/text_area.h"
+#include "console/screen/colours.h"
+#include "console/screen/window.h"
+#include "console/widgets/text_area.h"
 
 namespace Tarnel::Testing {
 

@@ -1,10 +1,10 @@
-#include "widgets/text_area.h"
+#include "console/widgets/text_area.h"
 
 #include <gtest/gtest.h>
 
 #include <vector>
 
-#include "shell/screen.h"
+#include "console/screen/screen.h"
 #include "tests/support/curses_screen.h"
 #include "tests/widgets/pane.h"
 
